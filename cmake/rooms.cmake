@@ -1,0 +1,53 @@
+# The three things that a room's CMakeLists.txt can ask for. A room's file is a list; the how stands here.
+
+# hv_room(NAME SOURCES file... LINKS target...): the static library hv_NAME; what it links, its users link too.
+function(hv_room name)
+    cmake_parse_arguments(ARG "" "" "SOURCES;LINKS" ${ARGN})
+    hv_refuse_leftovers(hv_room ${name} "${ARG_UNPARSED_ARGUMENTS}")
+    add_library(hv_${name} STATIC ${ARG_SOURCES})
+    target_link_libraries(hv_${name} PUBLIC ${ARG_LINKS} PRIVATE hv_flags)
+endfunction()
+
+# hv_program(NAME [ADMINISTRATOR] SOURCES file... LINKS target...): the program NAME in the preset's bin folder.
+# ADMINISTRATOR: Windows asks for elevation when it starts.
+function(hv_program name)
+    cmake_parse_arguments(ARG "ADMINISTRATOR" "" "SOURCES;LINKS" ${ARGN})
+    hv_refuse_leftovers(hv_program ${name} "${ARG_UNPARSED_ARGUMENTS}")
+    add_executable(${name} ${ARG_SOURCES})
+    target_link_libraries(${name} PRIVATE ${ARG_LINKS} hv_flags)
+    if(ARG_ADMINISTRATOR)
+        hv_add_manifest(${name} requireAdministrator)
+    else()
+        hv_add_manifest(${name} asInvoker)
+    endif()
+endfunction()
+
+# hv_test(NAME SOURCES file... LINKS target...): a GoogleTest program that ctest runs, on every target. There is no
+# other list of tests.
+function(hv_test name)
+    cmake_parse_arguments(ARG "" "" "SOURCES;LINKS" ${ARGN})
+    hv_refuse_leftovers(hv_test ${name} "${ARG_UNPARSED_ARGUMENTS}")
+    hv_program(${name} SOURCES ${ARG_SOURCES} LINKS ${ARG_LINKS} hv_test_support third::gtest_main)
+    add_test(NAME ${name} COMMAND ${name})
+endfunction()
+
+# Windows programs carry a manifest: narrow strings are UTF-8, paths may be long, Windows 10 is meant. Elsewhere nothing.
+function(hv_add_manifest program level)
+    if(NOT WIN32)
+        return()
+    endif()
+    set(HV_EXECUTION_LEVEL ${level})
+    set(manifest ${CMAKE_BINARY_DIR}/manifests/${level}.manifest)
+    configure_file(${CMAKE_SOURCE_DIR}/cmake/windows/program.manifest.in ${manifest} @ONLY)
+    set(HV_MANIFEST ${manifest})
+    set(script ${CMAKE_BINARY_DIR}/manifests/${level}.rc)
+    configure_file(${CMAKE_SOURCE_DIR}/cmake/windows/manifest.rc.in ${script} @ONLY)
+    target_sources(${program} PRIVATE ${script})
+    set_property(SOURCE ${script} PROPERTY OBJECT_DEPENDS ${manifest})
+endfunction()
+
+function(hv_refuse_leftovers function name leftovers)
+    if(leftovers)
+        message(FATAL_ERROR "${function}(${name}): what is meant by ${leftovers}?")
+    endif()
+endfunction()
