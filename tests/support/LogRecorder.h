@@ -1,0 +1,31 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+/// Collects every line logged to the two categories while it lives, whatever their priorities were before.
+///
+/// Lines read "PRIORITY category: message", such as "DEBUG hvdeploy-detail: Script execution succeeded". The
+/// categories exist once a recorder has been made, which the line parser takes for a set-up logging. Lines may come
+/// from any thread.
+class LogRecorder {
+public:
+    LogRecorder();
+    ~LogRecorder();
+    LogRecorder(const LogRecorder&) = delete;
+    LogRecorder& operator=(const LogRecorder&) = delete;
+
+    [[nodiscard]] std::vector<std::string> Lines() const;
+    [[nodiscard]] bool Has(const std::string& line) const;
+    [[nodiscard]] std::size_t Count(const std::string& line) const;
+    [[nodiscard]] std::vector<std::string> LinesStartingWith(const std::string& start) const;
+    /// All lines as one text, for a failure message.
+    [[nodiscard]] std::string Text() const;
+    void Clear();
+
+private:
+    class Collector;
+    struct Attached;
+    std::vector<Attached> attached_;
+    std::vector<int> priorities_;
+};
