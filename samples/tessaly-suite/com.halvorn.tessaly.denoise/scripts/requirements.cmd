@@ -1,0 +1,1 @@
+echo Tessaly Denoise profiles need 5 MB in ProgramData
