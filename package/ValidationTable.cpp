@@ -1,0 +1,23 @@
+#include "package/ValidationTable.h"
+
+#include <algorithm>
+
+namespace HV {
+
+void GetValidationFileNames(std::vector<std::string>& names) {
+    names.clear();
+    for (const ValidationRow& row : ValidationRows()) {
+        names.emplace_back(row.fileName);
+    }
+}
+
+void GetValidationInfo(const std::string& name, ValidationInfo& info) {
+    const auto rows = ValidationRows();
+    const auto row = std::ranges::find(rows, name, &ValidationRow::fileName);
+    if (row != rows.end()) {
+        info = {std::string(row->displayName), std::string(row->productId), std::string(row->version),
+                std::string(row->md5)};
+    }
+}
+
+}  // namespace HV
