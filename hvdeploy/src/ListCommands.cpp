@@ -1,0 +1,77 @@
+// The commands that print something instead of deploying.
+#include <algorithm>
+#include <iostream>
+
+#include "hosts/HostAppCheck.h"
+#include "hvdeploy/src/EntryTrace.h"
+#include "hvdeploy/src/HVDeployCLI.h"
+#include "hvdeploy/src/InstalledHistory.h"
+#include "hvframework/Log.h"
+
+namespace HV {
+namespace {
+
+constexpr const char* kOwner = "HV::DeployCLI::";
+
+}  // namespace
+
+int DeployCLI::DoListCommand() {
+    TraceEntry(kOwner, "DoListCommand");
+    const std::string wanted = GetArg("list=");
+    if (wanted == "hosts") {
+        return ListHosts();
+    }
+    if (wanted == "installed") {
+        return ListInstalled();
+    }
+    if (wanted == "packages") {
+        return ListPackages();
+    }
+    if (wanted == "commands") {
+        return ListCommands();
+    }
+    return 0;
+}
+
+int DeployCLI::ListHosts() {
+    TraceEntry(kOwner, "ListHosts");
+    HostAppCheck check;
+    if (!check.DetectHosts()) {
+        std::cout << "[]" << std::endl;
+        return 0;
+    }
+    const std::vector<HostRecord> hosts = check.Hosts();
+    HVL_LOG(Debug, "HV::HostAppCheck found " << hosts.size() << " host apps... ");
+    std::cout << "[\n";
+    for (std::size_t i = 0; i < hosts.size(); ++i) {
+        std::cout << hosts[i].ToText() << (i + 1 < hosts.size() ? ",\n" : "\n");
+    }
+    std::cout << "]" << std::endl;
+    return 0;
+}
+
+int DeployCLI::ListInstalled() {
+    TraceEntry(kOwner, "ListInstalled");
+    std::vector<std::string> stems = ReadHistoryStems(kHistoryFolder);
+    std::sort(stems.begin(), stems.end());
+    for (const std::string& stem : stems) {
+        std::cout << stem << '\n';
+    }
+    std::cout.flush();
+    return 0;
+}
+
+int DeployCLI::ListPackages() {
+    TraceEntry(kOwner, "ListPackages");
+    HVL_LOG(Warn, "ListPackages not yet implemented.");
+    return 0;
+}
+
+// The two share one text; the log of a caller that asks for the commands is searched for it.
+int DeployCLI::ListCommands() {
+    TraceEntry(kOwner, "ListCommands");
+    HVL_LOG(Warn, "ListPackages not yet implemented.");
+    return 0;
+}
+
+}  // namespace HV
