@@ -1,0 +1,31 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+/// One entry of an archive, true or lying. What is not set is told as it is.
+struct ArchiveEntry {
+    std::string name = {};
+    std::string bytes = {};
+    std::uint16_t method = 8;  // deflate; 0 stores; anything else stores under a false name
+    std::uint16_t flags = 0;
+    std::optional<std::uint32_t> claimedSize = std::nullopt;            // unpacked, in both headers
+    std::optional<std::uint32_t> claimedCompressedSize = std::nullopt;  // in both headers
+    std::optional<std::uint32_t> claimedChecksum = std::nullopt;        // in both headers
+    std::optional<std::uint32_t> localSize = std::nullopt;              // unpacked, in the entry's own header alone
+};
+
+/// Makes the bytes of a zip archive, entry by entry, without the libraries that read and write archives in the product:
+/// a test can claim anything in it.
+class ArchiveBuilder {
+public:
+    ArchiveBuilder& Add(ArchiveEntry entry);
+
+    /// The archive with its directory. The same entries give the same bytes.
+    [[nodiscard]] std::string Bytes() const;
+
+private:
+    std::vector<ArchiveEntry> entries_;
+};
