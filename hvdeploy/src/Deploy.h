@@ -56,6 +56,19 @@ public:
     /// Whether the conditions of `payload` let it be placed: 0 passes it over, 1 and -1 (none held) place it.
     int CheckPayloadPreconditions(const Payload& payload) const;
 
+    /// Runs the script file and then the command of `script`. Gives 1 when one of them succeeded, 0 when there is neither
+    /// or none succeeded and none had to, -2 as soon as one that has to succeed fails. Waits without a limit.
+    EngineResult RunPreOrPostflight(const PayloadScript& script, const Package& package);
+
+    /// Writes one registry value. Gives 0 when it is written or not meant for this system, -1 when its key cannot be
+    /// opened, else the registry's own code.
+    EngineResult MakeRegistryEntry(const RegistryEntry& entry);
+
+    /// Makes a shortcut onto one of `placedFiles` and appends it to `installedFiles`. Gives 1, 0 when there is one of
+    /// that name already, which is kept, or a failure.
+    EngineResult MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
+                              std::vector<std::string>& installedFiles);
+
     /// 0, or -1 when the package's own check fails.
     int ValidatePackage(Package& package) const;
 
@@ -148,12 +161,6 @@ private:
                           std::vector<std::string>& installedFiles, EngineResult& result);
     bool CopyPayloadItem(const PayloadPathPair& item);
     bool RequiredHostIsPresent(const Payload& payload);
-
-    // Side actions.
-    EngineResult RunPreOrPostflight(const PayloadScript& script, const Package& package);
-    EngineResult MakeRegistryEntry(const RegistryEntry& entry);
-    EngineResult MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
-                              std::vector<std::string>& installedFiles);
 
     std::uint32_t lastError = 0;  // stays 0: the report "An error has occured" carries no number of its own
     DeployRollback rollback;

@@ -1,6 +1,7 @@
 #include "hvdeploy/src/DeployJob.h"
 
 #include <boost/bind/bind.hpp>
+#include <boost/function.hpp>
 #include <deque>
 
 namespace HV {

@@ -15,7 +15,7 @@ namespace HV {
 /// Not thread-safe.
 class InstalledHistory {
 public:
-    explicit InstalledHistory(std::string folder) : folder(std::move(folder)) {}
+    explicit InstalledHistory(std::string historyFolder) : folder(std::move(historyFolder)) {}
 
     /// File names without their ending, in the folder's order. Empty when the folder is missing.
     const std::vector<std::string>& Stems();

@@ -1,5 +1,6 @@
 #include "platform/hosted/console.h"
 
+#include <fcntl.h>
 #include <signal.h>
 #include <unistd.h>
 
@@ -31,7 +32,7 @@ void ServeEvents() {
 // The thread waits for the life of the process.
 bool StartServing() {
     static const bool started = [] {
-        if (pipe(wakeUp) != 0) {
+        if (pipe2(wakeUp, O_CLOEXEC) != 0) {
             return false;
         }
         std::thread(ServeEvents).detach();
