@@ -8,5 +8,7 @@
 #ifdef _WIN32
 #include "platform/windows/win32.h"
 #else
+#include "platform/hosted/version_block.h"
+#include "platform/hosted/console.h"
 #include "platform/hosted/win32.h"
 #endif
