@@ -27,9 +27,13 @@ bool Matches(const HostRecord& host, const std::string& hostRef) {
 
 }  // namespace
 
-HostAppCheck::HostAppCheck() { AddPlatformDetectors(*this); }
+HostAppCheck::HostAppCheck() {
+    AddPlatformDetectors(*this);
+}
 
-void HostAppCheck::AddDetector(const boost::shared_ptr<HostAppDetector>& detector) { detectors.push_back(detector); }
+void HostAppCheck::AddDetector(const boost::shared_ptr<HostAppDetector>& detector) {
+    detectors.push_back(detector);
+}
 
 bool HostAppCheck::DetectHosts() {
     if (detectionDone) {

@@ -31,10 +31,10 @@ struct HostRecord {
     HostType hostType = HostType::NotSet;
     std::string hostAbbreviation;
     std::string hostDisplayName;
-    std::string hostVersion;        // as found, not normalised
-    std::string hostAppPath;        // the host's executable
-    std::string hostPluginPath;     // the host's own plug-ins
-    std::string hostSharedPath;     // shared with related hosts: MediaCore, or the OFX folder
+    std::string hostVersion;     // as found, not normalised
+    std::string hostAppPath;     // the host's executable
+    std::string hostPluginPath;  // the host's own plug-ins
+    std::string hostSharedPath;  // shared with related hosts: MediaCore, or the OFX folder
     std::string hostPresetsPath;
     std::string hostScriptsPath;
     std::string hostDocsPath;
