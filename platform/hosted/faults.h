@@ -2,6 +2,7 @@
 
 #include <array>
 #include <atomic>
+#include <cstddef>
 #include <cstdint>
 #include <mutex>
 #include <string>
@@ -22,10 +23,11 @@ inline constexpr std::size_t OperationCount = 5;
 class Faults {
 public:
     /// 0, or the errno with which the operation on `hostPath` has to fail. `bytes` is what a Write wants to write.
-    /// A rename asks for the old and the new name, as one operation.
+    /// Both names of a rename count: CheckRename() asks for them as one operation.
     int Check(Operation operation, const std::string& hostPath, std::uint64_t bytes = 0) {
         return armed_.load(std::memory_order_relaxed) ? CheckArmed(operation, hostPath, bytes) : 0;
     }
+    int CheckRename(const std::string& from, const std::string& to) { return Armed() ? CheckRenameArmed(from, to) : 0; }
     [[nodiscard]] bool Armed() const { return armed_.load(std::memory_order_relaxed); }
 
     /// Fails the `n`-th operation of this kind from now on, counted from 1, and only that one.
@@ -63,6 +65,8 @@ private:
     static std::vector<Order> ParseOrders(std::string_view text);
     void Obey(const Order& order);
     int CheckArmed(Operation operation, const std::string& hostPath, std::uint64_t bytes);
+    int CheckRenameArmed(const std::string& from, const std::string& to);
+    bool CountAndFail(Operation operation);
     bool IsHeld(Operation operation, const std::string& hostPath) const;
     bool HasSpaceFor(std::uint64_t bytes);
 

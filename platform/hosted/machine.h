@@ -24,8 +24,11 @@ public:
     /// Makes the machine in `folder` the current one and ends the one before it, with all its key handles.
     /// No other thread may be using the machine.
     static void Use(const std::string& folder);
+    /// Ends the current machine without writing anything more to its folder, which may be gone already.
+    static void Abandon();
 
     explicit Machine(const std::string& folder);
+    ~Machine();
     Machine(const Machine&) = delete;
     Machine& operator=(const Machine&) = delete;
 
@@ -54,24 +57,24 @@ public:
 private:
     struct BaseFolder;
 
-    static std::unique_ptr<Machine>& Instance();
-    static std::unique_ptr<BaseFolder> MakeBaseFolders(const std::string& account);
     template <class Char>
-    std::string ToHost(std::basic_string_view<Char> windowsPath) const;
-    void MakeFolders() const;
+    class HostName;
+
+    static Machine& First();
+    static std::unique_ptr<const BaseFolder> BaseFoldersOf(const std::string& account);
+    static void MakeFolders(const BaseFolder& folder, const std::string& hostPath);
     void ArmFromEnvironment();
 
     std::string folder_;
     std::string driveC_;
     std::string account_;
-    std::shared_ptr<const BaseFolder> baseFolders_;
+    std::unique_ptr<const BaseFolder> baseFolders_;
     Faults faults_;
     Environment environment_;
     Registry registry_;
 };
 
-/// UTF-8 of a wide text and back. What is no UTF-8 becomes U+FFFD.
-std::string ToUtf8(std::wstring_view text);
-std::wstring FromUtf8(std::string_view text);
+/// Ends the process with exit status 1 and the message on standard error: the machine cannot be what it promises.
+[[noreturn]] void EndWithMessage(const std::string& message);
 
 }  // namespace hosted

@@ -4,7 +4,6 @@
 #include <map>
 #include <memory>
 #include <mutex>
-#include <optional>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -31,13 +30,14 @@ struct RegistryValue {
 ///
 /// HKEY_CLASSES_ROOT is `HKEY_LOCAL_MACHINE\Software\Classes` and HKEY_CURRENT_CONFIG the current hardware profile, as
 /// on Windows; HKEY_CURRENT_USER is kept apart from HKEY_USERS. There is one view, the 64-bit one, and everybody may
-/// write everywhere. Thread-safe. Results are the error numbers of Windows.
+/// write everywhere. The keys of a fresh machine are always there and stand in the text only with values of their own.
+/// Thread-safe. Results are the error numbers of Windows.
 class Registry {
 public:
     /// Handles are numbers; those of the hives are Windows' own.
     using Handle = std::uintptr_t;
 
-    /// Reads `file` if it exists. `faults` is asked before every change and outlives the registry.
+    /// Reads `file`, or makes it if there is none. `faults` is asked before every change and outlives the registry.
     Registry(std::string file, Faults& faults);
     ~Registry();
     Registry(const Registry&) = delete;
@@ -64,26 +64,25 @@ public:
 
 private:
     struct Key;
-    struct OpenedKey {
-        std::shared_ptr<Key> key;
-        std::uint32_t access = 0;
-    };
+    using KeyPointer = std::shared_ptr<Key>;
+    struct OpenedKey;
 
-    std::shared_ptr<Key> Hive(std::string_view name) const;
-    std::int32_t Resolve(Handle handle, std::uint32_t access, std::shared_ptr<Key>& key) const;
-    Handle AddHandle(std::shared_ptr<Key> key, std::uint32_t access);
-    std::shared_ptr<Key> MakePath(const std::shared_ptr<Key>& from, std::string_view path, bool& created);
-    std::shared_ptr<Key> KeyOfPath(std::string_view fullPath, bool make);
-    std::int32_t CheckFault() const;
+    KeyPointer Find(const KeyPointer& from, std::string_view path) const;
+    KeyPointer Make(const KeyPointer& from, std::string_view path);
+    KeyPointer KeyOfFullPath(std::string_view fullPath, bool make);
+    std::int32_t Resolve(Handle handle, std::uint32_t access, KeyPointer& key);
+    Handle AddHandle(KeyPointer key, std::uint32_t access);
+    std::int32_t Prepare(const std::string& section);
     void Apply(const std::vector<RegistryChange>& changes);
-    void Append(const std::string& text);
+    void MakeBaseKeys();
     void ReadFile();
-    void MakeHives();
+    bool Append(const std::string& section);
+    std::string TextLocked() const;
 
     std::string file_;
     Faults& faults_;
     mutable std::mutex mutex_;
-    std::map<std::string, std::shared_ptr<Key>, LessIgnoringCase> hives_;
+    KeyPointer root_;
     std::unordered_map<Handle, OpenedKey> handles_;
     Handle nextHandle_ = 4;
     int appendTo_ = -1;

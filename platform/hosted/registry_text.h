@@ -36,11 +36,12 @@ private:
 /// The changes that `text` asks for, in their order. Throws RegistryTextError.
 std::vector<RegistryChange> ParseRegistryText(std::string_view text);
 
-/// The first line of a file of registry text, with the empty line behind it.
+/// The first line of a file of registry text. Sections follow, each with an empty line before it.
 std::string RegistryTextHeader();
 /// The lines that make or open `key`, set a value, delete a key, as they stand in a file; each ends in a line feed.
 std::string KeyLine(std::string_view key);
 std::string DeletedKeyLine(std::string_view key);
+std::string DeletedValueLine(std::string_view name);
 std::string ValueLine(std::string_view name, std::uint32_t type, std::string_view data);
 
 }  // namespace hosted
