@@ -23,9 +23,11 @@ std::optional<VS_FIXEDFILEINFO> ReadFixedFileInfo(const std::string& path) {
         !VerQueryValueA(block.data(), "\\", &value, &length)) {
         return std::nullopt;
     }
-    // The block is the executable's own text: a root value that is too short is no version.
+    // The block is the executable's own text: a root value that is too short, or that the block does not hold whole, is
+    // no version.
+    const auto offset = static_cast<unsigned char*>(value) - block.data();
     VS_FIXEDFILEINFO info{};
-    if (value == nullptr || length < sizeof info) {
+    if (length < sizeof info || block.size() < static_cast<std::size_t>(offset) + sizeof info) {
         return std::nullopt;
     }
     std::memcpy(&info, value, sizeof info);
