@@ -16,7 +16,8 @@ std::string LibraryFileName(const fs::path& file);
 /// The name of the log property file that the log library is to read in place of `file`: on Windows `file` itself.
 /// Hosted it is a private copy, removed when the process ends, whose values of keys that end in ".fileName" have their
 /// `${NAME}` variables filled in from the machine's environment and are turned into the host's names. A file that
-/// cannot be read gives its own host name, so that the library finds out and says so.
+/// cannot be read gives its own host name, so that the library finds out and says so; a copy that cannot be
+/// made throws fs::filesystem_error.
 std::string LibraryPropertyFile(const fs::path& file);
 
 /// Fills in functions for minizip's unzOpen2_64() and zipOpen2_64(); their file name is `fs::path::c_str()`. Reading is

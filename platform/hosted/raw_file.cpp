@@ -1,0 +1,111 @@
+#include "platform/raw_file.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <string>
+
+#include "platform/hosted/machine.h"
+
+namespace platform {
+namespace {
+
+using hosted::Machine;
+using hosted::Operation;
+
+class HostFile : public RawFile {
+public:
+    HostFile(int descriptor, std::string name) : descriptor_(descriptor), name_(std::move(name)) {}
+    ~HostFile() override { HostFile::Close(); }
+
+    std::int64_t ReadAt(std::uint64_t place, void* bytes, std::size_t count) override {
+        std::size_t done = 0;
+        while (done < count) {
+            const ssize_t got =
+                ::pread(descriptor_, static_cast<char*>(bytes) + done, count - done, static_cast<off_t>(place + done));
+            if (got < 0 && errno != EINTR) {
+                return -1;
+            }
+            if (got == 0) {
+                break;
+            }
+            done += got > 0 ? static_cast<std::size_t>(got) : 0;
+        }
+        return static_cast<std::int64_t>(done);
+    }
+
+    bool WriteAt(std::uint64_t place, const void* bytes, std::size_t count) override {
+        if (Machine::Current().GetFaults().Check(Operation::Write, name_, count) != 0) {
+            return false;
+        }
+        std::size_t done = 0;
+        while (done < count) {
+            const ssize_t put = ::pwrite(descriptor_, static_cast<const char*>(bytes) + done, count - done,
+                                         static_cast<off_t>(place + done));
+            if (put < 0 && errno != EINTR) {
+                return false;
+            }
+            done += put > 0 ? static_cast<std::size_t>(put) : 0;
+        }
+        return true;
+    }
+
+    [[nodiscard]] std::uint64_t Size() const override {
+        struct stat found {};
+        return ::fstat(descriptor_, &found) == 0 ? static_cast<std::uint64_t>(found.st_size) : 0;
+    }
+
+    bool Close() override {
+        const int descriptor = descriptor_;
+        descriptor_ = -1;
+        return descriptor < 0 || ::close(descriptor) == 0;
+    }
+
+private:
+    int descriptor_;
+    std::string name_;
+};
+
+bool IsReadOnly(const std::string& name) {
+    struct stat found {};
+    return ::stat(name.c_str(), &found) == 0 && (found.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH)) == 0;
+}
+
+int OpenFlags(RawFile::Mode mode) {
+    switch (mode) {
+        case RawFile::Mode::Read:
+            return O_RDONLY;
+        case RawFile::Mode::Change:
+            return O_RDWR;
+        case RawFile::Mode::Create:
+            return O_RDWR | O_CREAT | O_TRUNC;
+    }
+    return O_RDONLY;
+}
+
+bool IsOrdinary(int descriptor) {
+    struct stat found {};
+    return ::fstat(descriptor, &found) == 0 && S_ISREG(found.st_mode);
+}
+
+}  // namespace
+
+std::unique_ptr<RawFile> OpenRawFile(const wchar_t* windowsName, RawFile::Mode mode) {
+    std::string name = Machine::Current().HostPath(std::wstring_view(windowsName));
+    // The user of a machine may be root, whom a read-only file would not stop.
+    if (mode != RawFile::Mode::Read &&
+        (IsReadOnly(name) || Machine::Current().GetFaults().Check(Operation::Create, name) != 0)) {
+        return nullptr;
+    }
+    // Without waiting: opening a pipe must not hang before it is seen to be none of ours.
+    const int descriptor = ::open(name.c_str(), OpenFlags(mode) | O_CLOEXEC | O_NONBLOCK, 0666);
+    if (descriptor < 0) {
+        return nullptr;
+    }
+    auto file = std::make_unique<HostFile>(descriptor, std::move(name));
+    return IsOrdinary(descriptor) ? std::move(file) : nullptr;
+}
+
+}  // namespace platform
