@@ -51,9 +51,9 @@ public:
 
     /// Opens or creates each level of the `\`-separated `path` below `root` in turn, and leaves the last key in
     /// `output`, with the handle that it was opened through as `output.parent`. That handle is closed by then, unless
-    /// it is `root`: it only tells the destructor what to do. An empty path puts `root` itself into `output`, and with
-    /// it the duty to close it. Returns false, with `output` empty, as soon as a level fails; levels that were created
-    /// before it stay.
+    /// it is `root`: it only tells the destructor what to do. `root` is not the key that `output` holds on entry. An
+    /// empty path puts `root` itself into `output`, and with it the duty to close it. Returns false, with `output`
+    /// empty, as soon as a level fails; levels that were created before it stay.
     [[nodiscard]] static bool OpenPath(HKEY root, const std::string& path, Win32RegKeyHandle& output, bool create);
 
     /// Takes `Computer\HKEY_CURRENT_USER\Software\x` apart into its hive and the path below it; the leading
