@@ -81,7 +81,8 @@ bool GetUniqueFileName(const std::string& path, const std::function<bool(const s
 
 /// Removes a file, a link, or a directory with all its contents. Returns 0 on success, and also when there is nothing
 /// at `path`. The first thing that cannot be removed stops the walk and gives a non-zero result; what was removed
-/// before it is gone. Links are removed, never followed. Throws nothing of the filesystem library.
+/// before it is gone. Links are removed, never followed. A directory that cannot be
+/// listed is a result here, not an exception: clean-ups call this where nothing may be thrown.
 int DeleteFileOrDirectory(const std::string& path);
 
 /// Copies a file or a directory tree to the path `destination`, making its parent first. Returns 0 on success; -1,

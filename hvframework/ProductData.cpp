@@ -1,0 +1,125 @@
+#include "hvframework/ProductData.h"
+
+#include <picojson.h>
+
+#include <cstdlib>
+#include <string_view>
+
+#include "hvframework/StringUtils.h"
+#include "hvframework/Version.h"
+
+namespace HVL {
+namespace {
+
+constexpr std::string_view kIdentifier = "identifier";
+constexpr std::string_view kVersion = "version";
+constexpr std::string_view kDisplayName = "display_name";
+constexpr std::string_view kProductType = "product_type";
+constexpr std::string_view kInstallState = "install_state";
+constexpr std::string_view kInstalledDatetime = "installed_datetime";
+constexpr std::string_view kUninstall = "uninstall";
+constexpr std::string_view kUpgrade = "upgrade";
+constexpr std::string_view kInstalledFilePaths = "installed_file_paths";
+
+// Only the first character counts, so "tuesday" is true as well: release tools have written "t", "T", "True" and "1".
+bool ReadBool(const std::string& value) {
+    return !value.empty() && std::string_view("tT1").find(value.front()) != std::string_view::npos;
+}
+
+}  // namespace
+
+bool ProductData::operator<(const ProductData& other) const {
+    if (const int order = GetDisplayName().compare(other.GetDisplayName()); order != 0) {
+        return order < 0;
+    }
+    if (const int order = GetIdentifier().compare(other.GetIdentifier()); order != 0) {
+        return order < 0;
+    }
+    return Version(GetVersion()).IsLess(Version(other.GetVersion()));
+}
+
+bool ProductData::ReadJSON(const std::string& json) {
+    picojson::value document;
+    if (!picojson::parse(document, json).empty()) {
+        return false;
+    }
+    // The accessors throw on a value of another kind; the caller deals with that.
+    for (const auto& [key, value] : document.get<picojson::object>()) {
+        if (value.is<std::string>()) {
+            SetValue(key, value.get<std::string>());
+        } else if (value.is<picojson::array>() && key == kInstalledFilePaths) {
+            for (const auto& path : value.get<picojson::array>()) {
+                installedFilePaths.push_back(path.get<std::string>());
+            }
+        }
+    }
+    return true;
+}
+
+void ProductData::SetValue(const std::string& key, const std::string& value) {
+    if (key == kInstallState) {
+        installState = std::atoi(value.c_str());
+    } else if (key == kInstalledDatetime) {
+        installedDatetime = value;
+    } else if (key == kUninstall) {
+        uninstall = ReadBool(value);
+    } else if (key == kUpgrade) {
+        upgrade = value;
+    } else {
+        values[key] = value;
+    }
+}
+
+std::string ProductData::GetValue(const std::string& key) const {
+    if (const auto found = values.find(key); found != values.end()) {
+        return found->second;
+    }
+    if (key == kInstallState) {
+        return StringUtils::ToString(installState);
+    }
+    if (key == kInstalledDatetime) {
+        return installedDatetime;
+    }
+    if (key == kInstalledFilePaths) {
+        return GetInstalledFilePathsText();
+    }
+    if (key == kUpgrade) {
+        return upgrade;
+    }
+    if (key == kUninstall) {
+        return uninstall ? "true" : "false";
+    }
+    return {};
+}
+
+std::string ProductData::GetIdentifier() const {
+    return GetValue(std::string(kIdentifier));
+}
+
+std::string ProductData::GetVersion() const {
+    return GetValue(std::string(kVersion));
+}
+
+std::string ProductData::GetDisplayName() const {
+    return GetValue(std::string(kDisplayName));
+}
+
+std::int32_t ProductData::GetProductType() const {
+    const std::string text = GetValue(std::string(kProductType));
+    return text.empty() ? -1 : std::atoi(text.c_str());
+}
+
+// The blank before each quote and the one behind each comma are both written: what is compared with this text byte for
+// byte has two blanks between paths. Readers of it also expect backslashes as they are, not escaped.
+std::string ProductData::GetInstalledFilePathsText() const {
+    std::string text = "[";
+    for (std::size_t index = 0; index < installedFilePaths.size(); ++index) {
+        text += " \"" + installedFilePaths[index] + "\"";
+        if (index + 1 < installedFilePaths.size()) {
+            text += ", ";
+        }
+    }
+    return text + "]";
+}
+
+}  // namespace HVL
