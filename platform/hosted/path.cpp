@@ -217,19 +217,6 @@ private:
     Element element_;
 };
 
-/// How many folders the rest of `elements` leads down; negative if it leads up.
-int Depth(Elements elements) {
-    int depth = 0;
-    for (; !elements.AtEnd(); elements.Advance()) {
-        if (elements.Shown() == DotDot) {
-            --depth;
-        } else if (elements.Shown() != Dot) {
-            ++depth;
-        }
-    }
-    return depth;
-}
-
 }  // namespace
 
 path::path(const char* text) : text_(platform::WideFromUtf8(text)) {}
@@ -294,13 +281,12 @@ path& path::remove_trailing_separator() {
 }
 
 path& path::replace_extension(const path& extension) {
-    const path added = extension;  // It may be this very path.
     text_.resize(text_.size() - ExtensionSize(Filename(text_)));
-    if (!added.empty()) {
-        if (added.text_[0] != dot) {
+    if (!extension.empty()) {
+        if (extension.text_[0] != dot) {
             text_ += dot;
         }
-        text_ += added.text_;
+        text_ += extension.text_;
     }
     return *this;
 }
@@ -411,33 +397,6 @@ path path::lexically_normal() const {
         normal.text_ += dot;
     }
     return normal;
-}
-
-path path::lexically_relative(const path& base) const {
-    Elements own(text_);
-    Elements others(base.text_);
-    bool common = false;
-    for (; !own.AtEnd() && !others.AtEnd() && own.Shown() == others.Shown(); own.Advance(), others.Advance()) {
-        common = true;
-    }
-    if (own.AtEnd() && others.AtEnd()) {
-        return common ? path(Dot) : path();
-    }
-    const int up = Depth(others);
-    if (!common || up < 0) {
-        return {};
-    }
-    if (up == 0 && own.AtEnd()) {
-        return Dot;
-    }
-    path relative;
-    for (int i = 0; i < up; ++i) {
-        relative /= DotDot;
-    }
-    for (; !own.AtEnd(); own.Advance()) {
-        relative /= own.Shown();
-    }
-    return relative;
 }
 
 path::iterator path::begin() const {

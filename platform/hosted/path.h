@@ -110,8 +110,6 @@ public:
 
     /// `.` and `..` resolved in the text; a path that ends in a separator ends in `.` afterwards.
     [[nodiscard]] path lexically_normal() const;
-    /// The way from `base` to this path; empty if there is none.
-    [[nodiscard]] path lexically_relative(const path& base) const;
 
     /// Elements from the root name on; the root directory shows as `/`, a trailing separator as `.`.
     [[nodiscard]] iterator begin() const;
