@@ -1,0 +1,125 @@
+#include "tools/hvpack/Commands.h"
+
+#include <log4cpp/OstreamAppender.hh>
+#include <log4cpp/PatternLayout.hh>
+
+#include <exception>
+
+#include "hvframework/Log.h"
+#include "package/Package.h"
+#include "package/ZipEntries.h"
+#include "tools/hvpack/PackageMaker.h"
+
+namespace HVPack {
+namespace {
+
+constexpr const char* kUsage =
+    "usage: hvpack make FOLDER OUT.hvpkg   make a package of a folder that holds a _hvmanifest.xml\n"
+    "       hvpack check FILE...           check packages as the installer does\n"
+    "       hvpack list FILE               list what a package holds, folders first\n";
+
+using Arguments = std::vector<std::string>;
+
+/// While it lives, warnings and errors of the engine are lines on a stream, and nowhere else.
+class EngineLines {
+public:
+    explicit EngineLines(std::ostream& stream)
+        : category_(HVL::Log::Detail()),
+          appender_("hvpack", &stream),
+          additivity_(category_.getAdditivity()),
+          priority_(category_.getPriority()) {
+        auto* layout = new log4cpp::PatternLayout();  // the appender's, from here on
+        layout->setConversionPattern("%p: %m%n");
+        appender_.setLayout(layout);
+        category_.addAppender(appender_);
+        category_.setAdditivity(false);
+        category_.setPriority(log4cpp::Priority::WARN);
+    }
+    ~EngineLines() {
+        category_.removeAppender(&appender_);
+        category_.setAdditivity(additivity_);
+        category_.setPriority(priority_);
+    }
+    EngineLines(const EngineLines&) = delete;
+    EngineLines& operator=(const EngineLines&) = delete;
+
+private:
+    log4cpp::Category& category_;
+    log4cpp::OstreamAppender appender_;
+    bool additivity_;
+    log4cpp::Priority::Value priority_;
+};
+
+/// Runs `step` and gives what it says; a failure that is thrown becomes a line and false.
+template <typename Step>
+bool Report(std::ostream& err, Step step) {
+    try {
+        return step();
+    } catch (const std::exception& error) {
+        err << "hvpack: " << error.what() << '\n';
+        return false;
+    }
+}
+
+bool Make(const Arguments& arguments, std::ostream& out, std::ostream& err) {
+    return Report(err, [&] {
+        MakePackage(fs::path(arguments[1]), fs::path(arguments[2]));
+        out << "OK " << arguments[2] << '\n';
+        return true;
+    });
+}
+
+bool CheckOne(const std::string& file, std::ostream& out) {
+    HV::Package package{fs::path(file)};
+    if (package.zipPath.empty()) {
+        throw PackageError(file + " is not named .hvpkg or .zip");
+    }
+    if (!package.Validate(false)) {
+        throw PackageError(file + " is not a sound package");
+    }
+    out << "OK " << file << '\n';
+    return true;
+}
+
+bool Check(const Arguments& arguments, std::ostream& out, std::ostream& err) {
+    bool sound = true;
+    for (std::size_t file = 1; file < arguments.size(); ++file) {
+        sound &= Report(err, [&] { return CheckOne(arguments[file], out); });
+    }
+    return sound;
+}
+
+bool List(const Arguments& arguments, std::ostream& out, std::ostream& err) {
+    std::vector<std::string> files;
+    std::vector<std::string> directories;
+    if (HV::ReadZipEntries(arguments[1], files, directories) != 0) {
+        err << "hvpack: " << arguments[1] << " cannot be opened as a package\n";
+        return false;
+    }
+    for (const auto* names : {&directories, &files}) {
+        for (const std::string& name : *names) {
+            out << name << '\n';
+        }
+    }
+    return true;
+}
+
+}  // namespace
+
+int RunCommand(const Arguments& arguments, std::ostream& out, std::ostream& err) {
+    const EngineLines lines(err);
+    const std::string command = arguments.empty() ? "" : arguments[0];
+    if (command == "make" && arguments.size() == 3) {
+        return Make(arguments, out, err) ? 0 : 1;
+    }
+    if (command == "check" && arguments.size() > 1) {
+        return Check(arguments, out, err) ? 0 : 1;
+    }
+    if (command == "list" && arguments.size() == 2) {
+        return List(arguments, out, err) ? 0 : 1;
+    }
+    err << kUsage;
+    return 1;
+}
+
+}  // namespace HVPack

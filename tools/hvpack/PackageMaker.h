@@ -1,0 +1,24 @@
+#pragma once
+
+#include <stdexcept>
+#include <string>
+
+#include "platform/filesystem.h"
+
+namespace HVPack {
+
+/// Why a package could not be made, as a line for the person who asked for it.
+class PackageError : public std::runtime_error {
+public:
+    using std::runtime_error::runtime_error;
+};
+
+/// Makes a package of all that is in `folder`, and puts it at `output` when the engine's own check has found it sound.
+///
+/// The same folder gives the same bytes, whenever and wherever: entries are sorted by name, carry one fixed time and no
+/// attributes of their files, and every folder has an entry. The package is written into a folder of its own beside
+/// `output` and moved over it in the end, so that `output` is either what it was or complete. Throws PackageError; the
+/// engine's reasons for refusing a package are in the log.
+void MakePackage(const fs::path& folder, const fs::path& output);
+
+}  // namespace HVPack
