@@ -9,10 +9,6 @@
 namespace hosted {
 namespace {
 
-unsigned char UpperCase(char c) {
-    return static_cast<unsigned char>(c >= 'a' && c <= 'z' ? c - 'a' + 'A' : c);
-}
-
 /// The names under which `name` stands in the process, whatever their case, with their values.
 std::vector<std::pair<std::string, std::string>> ProcessVariables(std::string_view name) {
     std::vector<std::pair<std::string, std::string>> found;
@@ -27,16 +23,6 @@ std::vector<std::pair<std::string, std::string>> ProcessVariables(std::string_vi
 }
 
 }  // namespace
-
-bool LessIgnoringCase::operator()(std::string_view left, std::string_view right) const {
-    return std::lexicographical_compare(left.begin(), left.end(), right.begin(), right.end(),
-                                        [](char a, char b) { return UpperCase(a) < UpperCase(b); });
-}
-
-bool EqualsIgnoringCase(std::string_view left, std::string_view right) {
-    return std::equal(left.begin(), left.end(), right.begin(), right.end(),
-                      [](char a, char b) { return UpperCase(a) == UpperCase(b); });
-}
 
 Environment::Environment(const std::string& account) {
     // `users` and `windows` are spelled as they are on disk, which is how Wine gives them to a program.

@@ -6,14 +6,9 @@
 #include <string>
 #include <string_view>
 
-namespace hosted {
+#include "platform/hosted/ignoring_case.h"
 
-/// True when `left` comes before `right` without regard to the case of ASCII letters, in the order of upper case.
-struct LessIgnoringCase {
-    using is_transparent = void;
-    bool operator()(std::string_view left, std::string_view right) const;
-};
-bool EqualsIgnoringCase(std::string_view left, std::string_view right);
+namespace hosted {
 
 /// The environment of the machine: Windows 10's variables, and over them those of the process.
 ///

@@ -9,7 +9,7 @@
 #include <unordered_map>
 #include <vector>
 
-#include "platform/hosted/environment.h"
+#include "platform/hosted/ignoring_case.h"
 #include "platform/hosted/registry_text.h"
 
 namespace hosted {

@@ -18,16 +18,14 @@ public:
     [[nodiscard]] std::string Errors();
 
 private:
-    /// One standard stream: where its descriptor went, and the file that takes its place.
+    /// One standard stream: its descriptor, where that went before, and the file that takes its place.
     struct Stream {
-        int descriptor = -1;
-        int original = -1;
-        int file = -1;
-        std::string name;
+        int descriptor;
+        int original;
+        int file;
     };
     static Stream Redirect(int descriptor);
-    static void Restore(Stream& stream);
-    static std::string ReadAll(const Stream& stream);
+    static void Restore(const Stream& stream);
 
     Stream output_;
     Stream errors_;

@@ -1,7 +1,14 @@
 #pragma once
 
+#include <log4cpp/Priority.hh>
+#include <memory>
 #include <string>
 #include <vector>
+
+namespace log4cpp {
+class Appender;
+class Category;
+}  // namespace log4cpp
 
 /// Collects every line logged to the two categories while it lives, whatever their priorities were before.
 ///
@@ -24,8 +31,14 @@ public:
     void Clear();
 
 private:
+    struct Record;
     class Collector;
-    struct Attached;
-    std::vector<Attached> attached_;
-    std::vector<int> priorities_;
+    /// A category as it was, and the appender that it carries meanwhile and owns.
+    struct Attachment {
+        log4cpp::Category* category;
+        log4cpp::Priority::Value priority;
+        log4cpp::Appender* appender;
+    };
+    std::shared_ptr<Record> record_;
+    std::vector<Attachment> attachments_;
 };

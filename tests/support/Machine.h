@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+class MachineTarget;
+
 /// A Windows machine as tests speak of it: what it has, and what came of a run. The same on both targets.
 ///
 /// A fresh object is a fresh machine. Hosted it is a new folder, current until the object ends, and removed then; on
@@ -41,8 +43,9 @@ public:
     [[nodiscard]] std::map<std::string, std::string> FilesWithoutFolders() const;
     /// The names in the folder for temporary files, sorted.
     [[nodiscard]] std::vector<std::string> TempEntries() const;
-    /// Registry text of the keys that were added and of the values in them and in keys that were there, sorted.
-    /// Below HKEY_LOCAL_MACHINE\Software\Classes only keys that are new there are looked into.
+    /// Registry text of the values and the keys that were added, sorted; a key that only leads to others has no line of
+    /// its own. On Windows looked for below `Software` of the machine and of the user, in `Environment` of both, in the
+    /// current hardware profile, and in all keys that are new beside these.
     [[nodiscard]] std::string Registry() const;
 
     /// The folder for temporary files and the user's own folder, as the environment names them.
@@ -52,6 +55,5 @@ public:
     [[nodiscard]] std::string HostName(const std::string& path) const;
 
 private:
-    class Target;
-    std::unique_ptr<Target> target_;
+    std::unique_ptr<MachineTarget> target_;
 };
