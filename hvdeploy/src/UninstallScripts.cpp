@@ -3,9 +3,11 @@
 #include <cstdio>
 #include <ctime>
 #include <iostream>
+#include <utility>
 
 #include "hvdeploy/src/ScriptMaker.h"
 #include "hvframework/FileUtils.h"
+#include "hvframework/StringUtils.h"
 #include "hvframework/Version.h"
 #include "platform/filesystem.h"
 #include "platform/win32.h"
@@ -117,13 +119,11 @@ bool UninstallScripts::WriteStandaloneUninstallScript(std::string& scriptPath,
         }
     }
     AddEcho(script, package.GetName(), package.manifest.productVersion);
-    Lines newLines;
     // Only the lines of earlier segments are compared: a file that this package reports twice is deleted twice.
     const auto addDeleteLine = [&](const std::string& path) {
         const std::string line = script.MakeDeleteLine(path);
         if (knownLines.count(line) == 0) {
             script.AddLine(line);
-            newLines.insert(line);
         }
     };
     for (const std::string& path : installedFiles) {
@@ -135,7 +135,7 @@ bool UninstallScripts::WriteStandaloneUninstallScript(std::string& scriptPath,
     script.AddEmptyLine();
     script.AddLine(RegistryDeleteLine(product));
     script.AddEmptyLine();
-    Append(scriptPath, script.GetText(), newLines);
+    Append(scriptPath, script.GetText());
     return true;
 }
 
@@ -165,12 +165,11 @@ bool UninstallScripts::WriteServiceUninstallScript(std::string& scriptPath, cons
         }
     }
     AddEcho(script, package.GetName(), version);
-    const std::string call = UninstallerCallLine(identifier, version);
-    script.AddLine(call);
+    script.AddLine(UninstallerCallLine(identifier, version));
     script.AddEmptyLine();
     script.AddLine(RegistryDeleteLine(product));
     script.AddEmptyLine();
-    Append(scriptPath, script.GetText(), {call});
+    Append(scriptPath, script.GetText());
     return true;
 }
 
@@ -191,14 +190,20 @@ bool UninstallScripts::ReadExistingLines(const std::string& scriptPath) {
     return exists;
 }
 
-void UninstallScripts::Append(const std::string& scriptPath, const std::string& text, const Lines& newLines) {
+void UninstallScripts::Append(const std::string& scriptPath, const std::string& text) {
     std::FILE* file = nullptr;
     if (fopen_s(&file, scriptPath.c_str(), "a") != 0 || file == nullptr) {
         return;
     }
-    std::fwrite(text.data(), 1, text.size(), file);
-    std::fclose(file);
-    knownLines.insert(newLines.begin(), newLines.end());
+    const bool isWritten = std::fwrite(text.data(), 1, text.size(), file) == text.size();
+    if (std::fclose(file) != 0 || !isWritten) {
+        // The run does not fail for it; only what stands in the file now has to be read again.
+        knownPath.clear();
+        return;
+    }
+    for (std::string& line : HVL::StringUtils::Split(text, '\n')) {
+        knownLines.insert(std::move(line));
+    }
     knownPath = scriptPath;
     knownSize = SizeOf(scriptPath);
 }

@@ -41,7 +41,7 @@ private:
     using Lines = std::unordered_set<std::string>;
 
     bool ReadExistingLines(const std::string& scriptPath);
-    void Append(const std::string& scriptPath, const std::string& text, const Lines& newLines);
+    void Append(const std::string& scriptPath, const std::string& text);
 
     std::string knownPath;
     std::uint64_t knownSize = 0;
