@@ -13,7 +13,7 @@ constexpr std::string_view ByteOrderMark = "\xEF\xBB\xBF";
 constexpr std::uint32_t StringType = 1;
 constexpr std::uint32_t BinaryType = 3;
 constexpr std::uint32_t NumberType = 4;
-constexpr std::size_t HexLineLength = 76;
+constexpr std::size_t HexLineLength = 72;
 
 constexpr std::array<std::string_view, 5> HiveNames = {"HKEY_CLASSES_ROOT", "HKEY_CURRENT_USER", "HKEY_LOCAL_MACHINE",
                                                        "HKEY_USERS", "HKEY_CURRENT_CONFIG"};
