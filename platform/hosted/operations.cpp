@@ -80,7 +80,13 @@ std::uintmax_t AskSize(const path& file, error_code* error) {
     return number == 0 ? static_cast<std::uintmax_t>(found.st_size) : Failed;
 }
 
-/// What stands at `to` may be replaced only by a file, and only where Windows would do it.
+/// Windows lets a folder take the place of a file; the host does not, but it can make the two change places.
+int ReplaceFileByFolder(const std::string& from, const std::string& to) {
+    const int number = ErrorOf(::renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_EXCHANGE));
+    return number != 0 ? number : ErrorOf(::unlink(from.c_str()));
+}
+
+/// What stands at `to` may be replaced only where Windows would do it: no folder, and nothing read-only.
 int RenameOverExisting(const std::string& from, const std::string& to) {
     Stat source{};
     Stat target{};
@@ -89,8 +95,11 @@ int RenameOverExisting(const std::string& from, const std::string& to) {
     }
     const bool taken = ::lstat(to.c_str(), &target) == 0;
     const bool itself = taken && source.st_dev == target.st_dev && source.st_ino == target.st_ino;
-    if (taken && !itself && (S_ISDIR(source.st_mode) || S_ISDIR(target.st_mode) || IsReadOnly(target))) {
+    if (taken && !itself && (S_ISDIR(target.st_mode) || IsReadOnly(target))) {
         return EACCES;
+    }
+    if (taken && !itself && S_ISDIR(source.st_mode)) {
+        return ReplaceFileByFolder(from, to);
     }
     return ErrorOf(std::rename(from.c_str(), to.c_str()));
 }

@@ -143,11 +143,12 @@ TEST_F(FilesTest, ARenameNeverReplacesAFolder) {
     EXPECT_EQ(machine.Content(In("file")), "content");
 }
 
-TEST_F(FilesTest, ARenameOfAFolderNeverReplacesAFile) {
-    machine.HasFolder(In("folder"));
-    machine.Has(In("file"), "content");
-    EXPECT_TRUE(RenameError("folder", "file"));
-    EXPECT_EQ(machine.Content(In("file")), "content");
+TEST_F(FilesTest, ARenameOfAFolderReplacesAFile) {
+    machine.Has(In("folder\\below"), "content");
+    machine.Has(In("file"), "replaced");
+    EXPECT_FALSE(RenameError("folder", "file"));
+    EXPECT_EQ(machine.Content(In("file\\below")), "content");
+    EXPECT_EQ(NamesIn(Folder), (std::set<std::string>{"file"}));
 }
 
 TEST_F(FilesTest, ARenameToItselfChangesNothing) {

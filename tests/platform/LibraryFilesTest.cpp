@@ -16,7 +16,11 @@ constexpr const char* LogFile = "C:\\ProgramData\\the.log";
 
 class LibraryFilesTest : public testing::Test {
 protected:
-    ~LibraryFilesTest() override { log4cpp::Category::shutdown(); }
+    /// What the log library holds open, no machine can be rid of.
+    static void EndLogging() {
+        log4cpp::Appender::closeAll();
+        log4cpp::Category::shutdown();
+    }
 
     /// Sets the log library up by a file with this value for the appender's file, and writes one line.
     void LogTo(const std::string& fileName) {
@@ -32,7 +36,7 @@ protected:
                         "log4cpp.appender.A.layout.ConversionPattern=[%p] %m%n\r\n");
         log4cpp::PropertyConfigurator::configure(platform::LibraryPropertyFile(PropertyFile));
         log4cpp::Category::getRoot().info("hello");
-        log4cpp::Category::shutdown();
+        EndLogging();
     }
 
     Machine machine;
@@ -48,7 +52,7 @@ TEST_F(LibraryFilesTest, TheLogLibraryWritesToTheNameThatItIsGiven) {
     log4cpp::Category& category = log4cpp::Category::getInstance("library-files-test");
     category.addAppender(appender);
     category.info("hello");
-    log4cpp::Category::shutdown();
+    EndLogging();
     EXPECT_NE(machine.Content(LogFile).find("hello"), std::string::npos);
 }
 
