@@ -18,8 +18,8 @@ constexpr std::uint16_t kEncryptedFlag = 1;
 /// Deflate's shortest code stands for 258 bytes in two bits. Whoever claims more is not telling the truth.
 constexpr std::uint64_t kBestDeflateRatio = 1032;
 
-/// An archive that does not know its number of entries (it does not fit into the field) says this one.
-constexpr std::uint64_t kUnknownCount = 0xFFFF;
+/// What an archive says when its number of entries does not fit into the field: this many, or any number above.
+constexpr std::uint64_t kCountThatDoesNotFit = 0xFFFF;
 
 /// The library's lengths and results are ints: what it is asked for at once stays below.
 constexpr std::uint64_t kLargestRead = std::uint64_t{1} << 30;
@@ -80,7 +80,11 @@ bool ZipEntries::ListEntries() {
     while (step == UNZ_OK && ListCurrentEntry()) {
         step = unzGoToNextFile(archive_);
     }
-    return step == UNZ_END_OF_LIST_OF_FILE || (step != UNZ_OK && info.number_entry == kUnknownCount);
+    if (step == UNZ_END_OF_LIST_OF_FILE) {
+        return true;
+    }
+    return step != UNZ_OK && info.number_entry == kCountThatDoesNotFit &&
+           files_.size() + directories_.size() >= kCountThatDoesNotFit;
 }
 
 bool ZipEntries::ListCurrentEntry() {

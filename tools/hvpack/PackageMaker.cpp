@@ -10,6 +10,7 @@
 #include "package/Package.h"
 #include "package/ZipEntries.h"
 #include "platform/libraries.h"
+#include "tools/hvpack/WideCount.h"
 
 namespace HVPack {
 namespace {
@@ -143,6 +144,9 @@ void WriteArchive(const std::vector<Item>& items, const fs::path& path) {
         archive.Add(item, item.isDirectory ? std::string() : FileBytes(item));
     }
     archive.Finish();
+    if (items.size() >= kCountThatDoesNotFit && !AddWideCount(path, items.size())) {
+        throw PackageError("cannot write " + path.string());
+    }
 }
 
 /// A folder that is there for as long as the object. It holds the unfinished package under its final name, which is the
