@@ -158,7 +158,7 @@ TEST_F(AdobeAEDetector, TakesAnEmptyFolderForTheAnswer) {
 
 TEST_F(AdobeAEDetector, TakesAFolderOfATypeThatIsNoTextForAnEmptyAnswer) {
     HasAfterEffectsWithoutFolder("13.5");
-    HasValue(KeyOf("13.5"), "InstallPath", "hex(5):01,02,03,04");
+    HasValue(KeyOf("13.5"), "InstallPath", "hex(b):01,02,03,04,05,06,07,08");
     EXPECT_FALSE(Run());
     EXPECT_EQ(log.Lines(), (Texts{kAfterEffectsRuns, NoAppPath("13.5")}));
 }
