@@ -434,6 +434,16 @@ TEST_F(FaultsTest, CountWithoutFailing) {
     EXPECT_EQ(faults.Count(Operation::Rename), 0u);
 }
 
+// Windows refuses it on its own; Wine does not when it runs as root, so this is not asked of it.
+TEST_F(FaultsTest, AReadOnlyFileIsNotWrittenEvenByRoot) {
+    machine.HasReadOnly(file, "kept");
+    EXPECT_EQ(Write(file, "new"), EACCES);
+    FILE* stream = nullptr;
+    EXPECT_EQ(fopen_s(&stream, file.c_str(), "ab"), EACCES);
+    EXPECT_EQ(fopen_s(&stream, file.c_str(), "r+b"), EACCES);
+    EXPECT_EQ(machine.Content(file), "kept");
+}
+
 std::string Same(const std::string& path) {
     return path;
 }

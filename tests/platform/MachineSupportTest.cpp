@@ -52,6 +52,9 @@ TEST(MachineOfATest, IsClearedForTheNext) {
         machine.HasReadOnly(R"(C:\ProgramData\Deep\er\file)", "x");
         machine.Has(machine.TempFolder() + R"(\folder\file)", "x");
         machine.Loads("REGEDIT4\n[HKEY_LOCAL_MACHINE\\Software\\Halvorn\\Sub]\n\"a\"=\"b\"\n");
+        machine.Loads("REGEDIT4\n[HKEY_CLASSES_ROOT\\.hvtest]\n@=\"x\"\n");
+        EXPECT_NE(machine.Registry().find("[HKEY_LOCAL_MACHINE\\SOFTWARE\\Classes\\.hvtest]\n@=\"x\""),
+                  std::string::npos);
         EXPECT_EQ(machine.Files().size(), 4u);
         EXPECT_EQ(machine.TempEntries(), std::vector<std::string>{"folder"});
     }

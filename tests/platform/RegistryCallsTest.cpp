@@ -317,7 +317,7 @@ TEST_F(RegistryCalls, TheClassesOfTheMachineAreAHiveOfTheirOwn) {
 
 TEST_F(RegistryCalls, ALongNameIsRefused) {
     HKEY made = nullptr;
-    EXPECT_NE(Create(key, std::string(256, 'x').c_str(), made), ERROR_SUCCESS);
+    EXPECT_NE(Create(key, std::string(300, 'x').c_str(), made), ERROR_SUCCESS);
     ASSERT_EQ(Create(key, std::string(255, 'x').c_str(), made), ERROR_SUCCESS);
     RegCloseKey(made);
 }

@@ -44,8 +44,8 @@ public:
     /// The names in the folder for temporary files, sorted.
     [[nodiscard]] std::vector<std::string> TempEntries() const;
     /// Registry text of the values and the keys that were added, sorted; a key that only leads to others has no line of
-    /// its own. On Windows looked for below `Software` of the machine and of the user, in `Environment` of both, in the
-    /// current hardware profile, and in all keys that are new beside these.
+    /// its own. On Windows keys that a fresh machine has are looked into where programs leave things: `Software` (new
+    /// keys in `Classes` and `Microsoft` too), the list of installed programs, `Environment`, the hardware profile.
     [[nodiscard]] std::string Registry() const;
 
     /// The folder for temporary files and the user's own folder, as the environment names them.

@@ -68,10 +68,12 @@ public:
 
 private:
     void Add(const std::filesystem::directory_entry& entry, const std::string& path) {
-        const bool isFolder = entry.is_directory() && !entry.is_symlink();
+        const auto known = base_.find(path);
+        // Asking an entry what it is costs far more than its name, and of the old ones the answer is known.
+        const bool isFolder = known != base_.end() ? known->second : entry.is_directory() && !entry.is_symlink();
         items_.emplace(path, isFolder);
         // While a fresh machine is listed all that is found belongs to it.
-        const bool isBase = base_.empty() || base_.count(path) > 0;
+        const bool isBase = base_.empty() || known != base_.end();
         if (isFolder && !(isBase && IsUninteresting(path, temp_))) {
             List(entry.path(), path);
         }

@@ -26,14 +26,27 @@ const Hive hives[] = {{"HKEY_LOCAL_MACHINE", HKEY_LOCAL_MACHINE},
                       {"HKEY_CLASSES_ROOT", HKEY_CLASSES_ROOT},
                       {"HKEY_CURRENT_CONFIG", HKEY_CURRENT_CONFIG}};
 
-/// Where a fresh machine's own keys are looked into, and where not: these are thousands that nobody here changes.
-const char* const lookedInto[] = {R"(HKEY_LOCAL_MACHINE\SOFTWARE)",
-                                  R"(HKEY_LOCAL_MACHINE\SYSTEM\CurrentControlSet\Control\Session Manager\Environment)",
-                                  R"(HKEY_LOCAL_MACHINE\SYSTEM\CurrentControlSet\Hardware Profiles\Current)",
-                                  R"(HKEY_CURRENT_USER\Software)", R"(HKEY_CURRENT_USER\Environment)"};
-const char* const passedOver[] = {R"(HKEY_LOCAL_MACHINE\SOFTWARE\Classes)",
-                                  R"(HKEY_LOCAL_MACHINE\SOFTWARE\Wow6432Node)", R"(HKEY_CURRENT_USER\Software\Classes)",
-                                  R"(HKEY_CURRENT_USER\Software\Wine)"};
+/// Which of a fresh machine's own keys are looked into. The others are many, a call into another process each, and
+/// nobody here changes them. The longest path that fits decides: all below it is looked into, or only what is new
+/// directly in it.
+struct Region {
+    std::string key;
+    bool isWhole;
+};
+const Region regions[] = {{"HKEY_LOCAL_MACHINE", false},
+                          {R"(HKEY_LOCAL_MACHINE\SOFTWARE)", true},
+                          {R"(HKEY_LOCAL_MACHINE\SOFTWARE\Classes)", false},
+                          {R"(HKEY_LOCAL_MACHINE\SOFTWARE\Microsoft)", false},
+                          {R"(HKEY_LOCAL_MACHINE\SOFTWARE\Microsoft\Windows\CurrentVersion\Uninstall)", true},
+                          {R"(HKEY_LOCAL_MACHINE\SOFTWARE\Wow6432Node)", false},
+                          {R"(HKEY_LOCAL_MACHINE\SYSTEM\CurrentControlSet\Control\Session Manager\Environment)", true},
+                          {R"(HKEY_LOCAL_MACHINE\SYSTEM\CurrentControlSet\Hardware Profiles\Current)", true},
+                          {"HKEY_CURRENT_USER", false},
+                          {R"(HKEY_CURRENT_USER\Environment)", true},
+                          {R"(HKEY_CURRENT_USER\Software)", true},
+                          {R"(HKEY_CURRENT_USER\Software\Classes)", false},
+                          {R"(HKEY_CURRENT_USER\Software\Wine)", false},
+                          {"HKEY_USERS", false}};
 
 bool IsSameOrBelow(const std::string& path, const std::string& key) {
     return hosted::EqualsIgnoringCase(path.substr(0, key.size()), key) &&
@@ -41,17 +54,16 @@ bool IsSameOrBelow(const std::string& path, const std::string& key) {
 }
 
 bool IsLookedInto(const std::string& path) {
-    for (const char* key : passedOver) {
-        if (IsSameOrBelow(path, key)) {
-            return false;
-        }
-    }
-    for (const char* key : lookedInto) {
-        if (IsSameOrBelow(path, key) || IsSameOrBelow(key, path)) {
+    const Region* longest = nullptr;
+    for (const Region& region : regions) {
+        if (IsSameOrBelow(region.key, path)) {
             return true;
         }
+        if (IsSameOrBelow(path, region.key) && (longest == nullptr || region.key.size() > longest->key.size())) {
+            longest = &region;
+        }
     }
-    return path.find('\\') == std::string::npos;
+    return longest != nullptr && longest->isWhole;
 }
 
 /// Wine spells two keys of the machine in its own way.
