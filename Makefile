@@ -1,0 +1,51 @@
+# The commands of the house. Each brings what it needs by itself; scripts/setup is quick when nothing is missing.
+
+SHELL := /bin/bash
+.DEFAULT_GOAL := help
+.PHONY: help setup demo demo-windows test test-hosted test-asan test-tsan test-windows bench format tidy clean
+
+help:
+	@echo "make demo | demo-windows      install the sample suite on a fresh machine and show what came of it"
+	@echo "make test                     every test on both targets"
+	@echo "make test-hosted | test-asan | test-tsan | test-windows"
+	@echo "make bench | format | tidy | setup | clean"
+
+setup:
+	@scripts/setup
+
+demo: setup
+	@scripts/demo hosted
+
+demo-windows: setup
+	@scripts/demo windows
+
+test: test-hosted test-windows
+
+# The Windows tests compare what both targets leave behind, so they need the hosted programs too.
+test-windows: build-hosted
+
+test-hosted: test-on-hosted
+test-asan: test-on-hosted-asan
+test-tsan: test-on-hosted-tsan
+test-windows: test-on-windows
+
+build-%: setup
+	@echo "== Building the preset $*"
+	@cmake --preset $* >/dev/null
+	@cmake --build --preset $*
+
+test-on-%: build-%
+	@echo "== Testing the preset $*"
+	@ctest --preset $*
+
+bench: build-hosted
+	@bench/run
+
+format: setup
+	@git ls-files '*.h' '*.cpp' | xargs clang-format -i
+
+tidy: build-hosted
+	@git ls-files '*.cpp' ':!platform/windows/*' ':!tests/*Windows*' | xargs -P 2 -n 4 clang-tidy --quiet -p build/hosted
+
+clean:
+	@rm -rf build dist
