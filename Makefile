@@ -29,12 +29,15 @@ test-asan: test-on-hosted-asan
 test-tsan: test-on-hosted-tsan
 test-windows: test-on-windows
 
-build-%: setup
+PRESETS := hosted hosted-asan hosted-tsan windows
+.PHONY: $(PRESETS:%=build-%) $(PRESETS:%=test-on-%)
+
+$(PRESETS:%=build-%): build-%: setup
 	@echo "== Building the preset $*"
 	@cmake --preset $* >/dev/null
 	@cmake --build --preset $*
 
-test-on-%: build-%
+$(PRESETS:%=test-on-%): test-on-%: build-%
 	@echo "== Testing the preset $*"
 	@ctest --preset $*
 
