@@ -10,7 +10,7 @@
 #include "hvframework/Shortcut.h"
 #include "tests/support/CapturedStreams.h"
 #include "tests/support/Faults.h"
-#include "tests/support/LinkReader.h"
+#include "tests/support/LinkFileReader.h"
 #include "tests/support/Machine.h"
 
 namespace {
@@ -41,13 +41,20 @@ std::string OutputOf(const std::string& command) {
 
 TEST_F(ShortcutHostedTest, SpellsItsTargetAsShellItemsToo) {
     EXPECT_EQ(MakeShortcut(kProgram, kLink), 0);
-    EXPECT_EQ(ReadLink(machine.Content(kLink)).itemsTarget, kProgram);
+    EXPECT_EQ(ReadLinkFile(machine.Content(kLink)).itemsTarget, kProgram);
 }
 
 TEST_F(ShortcutHostedTest, NamesKindAndSizeOfItsTarget) {
     EXPECT_EQ(MakeShortcut(kProgram, kLink), 0);
-    EXPECT_EQ(ReadLink(machine.Content(kLink)).attributes, 0x20U);
-    EXPECT_EQ(ReadLink(machine.Content(kLink)).size, 7U);
+    EXPECT_EQ(ReadLinkFile(machine.Content(kLink)).attributes, 0x20U);
+    EXPECT_EQ(ReadLinkFile(machine.Content(kLink)).size, 7U);
+}
+
+TEST_F(ShortcutHostedTest, SaysOfAFolderThatItIsOne) {
+    machine.HasFolder(R"(C:\Users\Public\Presets)");
+    EXPECT_EQ(MakeShortcut(R"(C:\Users\Public\Presets)", kLink), 0);
+    EXPECT_EQ(ReadLinkFile(machine.Content(kLink)).attributes, 0x10U);
+    EXPECT_EQ(ReadLinkFile(machine.Content(kLink)).size, 0U);
 }
 
 TEST_F(ShortcutHostedTest, IsTheSameFileEachTime) {
@@ -59,9 +66,13 @@ TEST_F(ShortcutHostedTest, IsTheSameFileEachTime) {
 TEST_F(ShortcutHostedTest, LeavesNoHalfLinkOnAFullDisk) {
     MachineFaults faults(machine);
     faults.LimitSpace(100);
-    CapturedStreams streams;
-    EXPECT_EQ(MakeShortcut(kProgram, kLink), -1);
-    EXPECT_EQ(streams.Errors(), "ERROR at HVL::FileUtils::MakeShortcut:513\n");
+    std::string errors;
+    {
+        CapturedStreams streams;
+        EXPECT_EQ(MakeShortcut(kProgram, kLink), -1);
+        errors = streams.Errors();
+    }
+    EXPECT_EQ(errors, "ERROR at HVL::FileUtils::MakeShortcut:513\n");
     EXPECT_FALSE(machine.Exists(kLink));
 }
 

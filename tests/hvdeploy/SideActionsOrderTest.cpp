@@ -2,7 +2,7 @@
 #include <algorithm>
 
 #include "tests/hvdeploy/SideActionsTest.h"
-#include "tests/support/LinkReader.h"
+#include "tests/support/Link.h"
 
 namespace {
 
@@ -142,7 +142,7 @@ TEST_F(SideActionsOrderTest, AShortcutPointsToAFileOfItsOwnPayload) {
 
 TEST_F(SideActionsOrderTest, AShortcutDoesNotPointToTheLinkMadeBeforeIt) {
     EXPECT_EQ(Deploy(Placing().Shortcut("Glow.exe", "", "startmenu").Shortcut("Glow.lnk", "", "programdata")), 1);
-    EXPECT_EQ(ReadLink(machine.Content(kLink)).target, kPlacedFile);
+    EXPECT_EQ(LinkOf(machine, kLink).target, kPlacedFile);
     EXPECT_TRUE(log.Has(ErrorLine("Shortcut source path not found.")));
 }
 

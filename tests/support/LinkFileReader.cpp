@@ -1,4 +1,4 @@
-#include "tests/support/LinkReader.h"
+#include "tests/support/LinkFileReader.h"
 
 #include <stdexcept>
 
@@ -82,7 +82,7 @@ class Reader {
 public:
     explicit Reader(const std::string& bytes) : file_(bytes) {}
 
-    LinkContent Read() {
+    LinkFileContent Read() {
         ReadHeader();
         if (Has(0x01)) {
             ReadItems();
@@ -189,11 +189,11 @@ private:
     Piece file_;
     std::size_t at_ = 0;
     std::uint32_t flags_ = 0;
-    LinkContent content_;
+    LinkFileContent content_;
 };
 
 }  // namespace
 
-LinkContent ReadLink(const std::string& bytes) {
+LinkFileContent ReadLinkFile(const std::string& bytes) {
     return Reader(bytes).Read();
 }
