@@ -4,6 +4,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <array>
 #include <atomic>
 #include <cerrno>
 #include <climits>
@@ -12,6 +14,7 @@
 #include <cstring>
 #include <mutex>
 #include <stdexcept>
+#include <type_traits>
 #include <vector>
 
 #include "platform/utf8.h"
@@ -27,7 +30,18 @@ constexpr const char* RegistryFileName = "registry.reg";
 /// Below it nothing exists and nothing can be made, whoever asks.
 constexpr const char* Nowhere = "/dev/null/nowhere";
 
-constexpr std::wstring_view RefusedCharacters = L"<>:\"|?*";
+/// Characters that no name on a drive of Windows may hold, by their ASCII code. Looked up for every character of a
+/// path.
+constexpr std::array<bool, 128> RefusedCharacters = [] {
+    std::array<bool, 128> refused{};
+    for (std::size_t code = 0; code < ' '; ++code) {
+        refused[code] = true;
+    }
+    for (const char c : {'<', '>', ':', '"', '|', '?', '*'}) {
+        refused[static_cast<std::size_t>(c)] = true;
+    }
+    return refused;
+}();
 
 std::atomic<Machine*> current{nullptr};
 std::mutex makingFirst;
@@ -79,13 +93,15 @@ void AppendAsUtf8(std::string& text, std::string_view part) {
 
 /// Nearly every name is plain ASCII, which needs no conversion.
 void AppendAsUtf8(std::string& text, std::wstring_view part) {
-    for (std::size_t at = 0; at < part.size(); ++at) {
-        if (part[at] > 0x7F) {
-            text += platform::Utf8FromWide(part.substr(at));
-            return;
-        }
-        text += static_cast<char>(part[at]);
+    const bool plain = std::all_of(part.begin(), part.end(), [](wchar_t c) { return c >= 0 && c <= 0x7F; });
+    if (!plain) {
+        text += platform::Utf8FromWide(part);
+        return;
     }
+    const std::size_t start = text.size();
+    text.resize(start + part.size());
+    std::transform(part.begin(), part.end(), text.begin() + static_cast<std::ptrdiff_t>(start),
+                   [](wchar_t c) { return static_cast<char>(c); });
 }
 
 template <class Char>
@@ -118,8 +134,8 @@ bool EqualsName(const std::string& name, std::basic_string_view<Char> text) {
 
 template <class Char>
 bool IsRefused(Char c) {
-    const auto code = static_cast<wchar_t>(c);
-    return (code >= 0 && code < L' ') || RefusedCharacters.find(code) != std::wstring_view::npos;
+    const auto code = static_cast<std::make_unsigned_t<Char>>(c);
+    return code < RefusedCharacters.size() && RefusedCharacters[code];
 }
 
 bool IsBelowOrEqual(std::string_view path, std::string_view folder) {
