@@ -178,10 +178,8 @@ TEST_F(HostedMachineTest, PassesSetVariablesOnToChildren) {
     EXPECT_EQ(std::getenv("HV_TEST_CHILD"), nullptr);
 }
 
-class HostedMachineDeathTest : public HostedMachineTest {
-protected:
-    HostedMachineDeathTest() { testing::FLAGS_gtest_death_test_style = "threadsafe"; }
-};
+// The process that dies is a copy of this one, on the same machine, so that it leaves no folder of its own behind.
+using HostedMachineDeathTest = HostedMachineTest;
 
 TEST_F(HostedMachineDeathTest, EndsClearlyWhenItsFolderCannotBeMade) {
     EXPECT_EXIT(hosted::Machine::Use("/dev/null/machine"), testing::ExitedWithCode(1),
