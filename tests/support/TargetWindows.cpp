@@ -48,6 +48,9 @@ const Region regions[] = {{"HKEY_LOCAL_MACHINE", false},
                           {R"(HKEY_CURRENT_USER\Software\Wine)", false},
                           {"HKEY_USERS", false}};
 
+/// The display's own keys, made with the first window that anybody opens.
+constexpr const char* DisplayKey = R"(HKEY_LOCAL_MACHINE\SYSTEM\CurrentControlSet\Control\Video)";
+
 bool IsSameOrBelow(const std::string& path, const std::string& key) {
     return hosted::EqualsIgnoringCase(path.substr(0, key.size()), key) &&
            (path.size() == key.size() || path[key.size()] == '\\');
@@ -134,6 +137,9 @@ public:
     RegistryLister(const RegistryContent* base, RegistryContent& content) : base_(base), content_(content) {}
 
     void List(HKEY parent, const std::string& name, const std::string& path) {
+        if (IsSameOrBelow(path, DisplayKey)) {
+            return;
+        }
         const bool isBase = base_ == nullptr || base_->count(path) > 0;
         RegistryValues& values = content_[path];
         if (isBase && !IsLookedInto(path)) {
