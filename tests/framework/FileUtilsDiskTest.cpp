@@ -84,6 +84,11 @@ TEST_F(Creating, LeavesAFileOfThatNameAlone) {
     EXPECT_EQ(machine.Content(R"(C:\T\a)"), "x");
 }
 
+TEST_F(Creating, IsDoneWhenTheParentWasAllThatWasMissing) {
+    EXPECT_EQ(CreateDirectories(R"(C:\T\a\.)"), 0);
+    EXPECT_TRUE(DirectoryExists(R"(C:\T\a)"));
+}
+
 TEST_F(Creating, FailsBelowAFile) {
     machine.Has(R"(C:\T\a)", "x");
     EXPECT_NE(CreateDirectories(R"(C:\T\a\b)"), 0);

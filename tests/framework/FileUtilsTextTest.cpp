@@ -251,8 +251,11 @@ TEST_F(UniqueName, IsFlaggedGoodWithTheLastCounter) {
 }
 
 TEST_F(UniqueName, GoesOnSearchingPastTheLastCounterButIsFlagged) {
-    EXPECT_FALSE(Search(R"(C:\un.bat)", 131075));
-    EXPECT_EQ(candidates.back(), R"(C:\un-131075.bat)");
+    EXPECT_FALSE(Search(R"(C:\un.bat)", 131073));
+    EXPECT_EQ(candidates.back(), R"(C:\un-131073.bat)");
+    candidates.clear();
+    EXPECT_FALSE(Search(R"(C:\un.bat)", 131080));
+    EXPECT_EQ(candidates.back(), R"(C:\un-131080.bat)");
 }
 
 class WellKnownPlaces : public testing::Test {
