@@ -1,10 +1,10 @@
 // One payload: into which folders its files go, and the copying itself.
 #include <algorithm>
-#include <array>
 #include <iostream>
 
 #include "hvdeploy/src/Deploy.h"
 #include "hvdeploy/src/EntryTrace.h"
+#include "hvdeploy/src/TargetDirectories.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "system/SystemDirectories.h"
@@ -15,14 +15,6 @@ namespace {
 using namespace HVL;
 
 constexpr const char* kOwner = "HV::Deploy::";
-
-// The keywords that a payload of this system can name as its target. The others are those of the other system; an
-// application alone may name them.
-constexpr std::array kTargetDirectories{
-    SysDir::AbsolutePath, SysDir::CommonDocs,     SysDir::LocalAppData, SysDir::Ofx,      SysDir::ProgramData,
-    SysDir::ProgramFiles, SysDir::ProgramFiles32, SysDir::Logs,         SysDir::UserLogs, SysDir::History,
-    SysDir::StartMenu,    SysDir::Temp,           SysDir::WinSys,
-};
 
 bool IsHostPayload(const Payload& payload) {
     return payload.type == PayloadType::Plugin || payload.deployment == DeploymentType::HostPlugins ||
@@ -140,7 +132,7 @@ EngineResult Deploy::DeploySysDirPayload(const Payload& payload, const Package& 
         return kNothingDone;
     }
     const SysDir directory = SysDirFromKeyword(payload.sysdir);
-    if (std::find(kTargetDirectories.begin(), kTargetDirectories.end(), directory) == kTargetDirectories.end()) {
+    if (!IsTargetDirectory(directory)) {
         HVL_LOG(Error, "UNSUPPORTED payload sysdir value: " << payload.sysdir);
         return kPlacementFailed;
     }

@@ -1,10 +1,9 @@
 // What goes with a placed payload: scripts, registry entries and shortcuts.
-#include <algorithm>
-#include <array>
 #include <cstdio>
 
 #include "hvdeploy/src/Deploy.h"
 #include "hvdeploy/src/EntryTrace.h"
+#include "hvdeploy/src/TargetDirectories.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "hvframework/Shortcut.h"
@@ -36,13 +35,6 @@ int RunCommandCapture(const std::string& line, std::string& output) {
     // It stays: packages in the field hold scripts that exit with small codes and are expected to pass.
     return _pclose(pipe) / 256;
 }
-
-// The keywords that a shortcut can name as its folder.
-constexpr std::array kShortcutDirectories{
-    SysDir::AbsolutePath, SysDir::CommonDocs,     SysDir::LocalAppData, SysDir::Ofx,      SysDir::ProgramData,
-    SysDir::ProgramFiles, SysDir::ProgramFiles32, SysDir::Logs,         SysDir::UserLogs, SysDir::History,
-    SysDir::StartMenu,    SysDir::Temp,           SysDir::WinSys,
-};
 
 std::string ShortcutFolder(const Shortcut& shortcut, SysDir directory) {
     if (directory == SysDir::AbsolutePath) {
@@ -155,7 +147,7 @@ EngineResult Deploy::MakeShortcut(const Shortcut& shortcut, const std::vector<st
                                   std::vector<std::string>& installedFiles) {
     TraceEntry(kOwner, "MakeShortcut");
     const SysDir directory = SysDirFromKeyword(shortcut.sysdir);
-    if (std::find(kShortcutDirectories.begin(), kShortcutDirectories.end(), directory) == kShortcutDirectories.end()) {
+    if (!IsTargetDirectory(directory)) {
         HVL_LOG(Error, "Invalid sysdir specified for shortcut.");
         return kFailed;
     }
