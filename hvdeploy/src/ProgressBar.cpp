@@ -1,6 +1,7 @@
 #include "hvdeploy/src/ProgressBar.h"
 
 #include <algorithm>
+#include <mutex>
 #include <ostream>
 #include <streambuf>
 #include <string>
@@ -34,6 +35,9 @@ std::string BarLine(std::uint32_t percent, const std::string& message) {
 }  // namespace
 
 /// Stands between the stream and the terminal, and knows whether the bar is on the last line.
+///
+/// Reports and texts come from the thread of the run; the line that says "cancelled" comes from the thread on which the
+/// platform tells of an interrupt. So every way in takes the mutex.
 class ProgressBar::Screen : public std::streambuf {
 public:
     explicit Screen(std::streambuf* below) : terminal(below) {}
@@ -41,6 +45,7 @@ public:
     std::streambuf* Below() const { return terminal; }
 
     void Show(std::uint32_t newPercent, const std::string& newMessage) {
+        const std::lock_guard<std::mutex> guard(mutex);
         // A failed run leaves the bar where it came to a halt.
         percent = newPercent == kFailedPercent ? percent : std::min<std::uint32_t>(newPercent, 100);
         if (!newMessage.empty()) {
@@ -54,6 +59,8 @@ public:
     }
 
     void Finish() {
+        const std::lock_guard<std::mutex> guard(mutex);
+        Draw();
         if (shown) {
             terminal->sputc('\n');
             shown = false;
@@ -75,15 +82,17 @@ protected:
         if (count <= 0) {
             return 0;
         }
+        const std::lock_guard<std::mutex> guard(mutex);
         Erase();
         const std::streamsize written = terminal->sputn(text, count);
         atLineStart = text[count - 1] == '\n';
+        // Not every writer flushes its lines, the log does not: the end of a line is what brings the bar back.
+        Draw();
         return written;
     }
 
-    // Texts come in pieces; the bar returns when the writer says that its text is complete.
     int sync() override {
-        Draw();
+        const std::lock_guard<std::mutex> guard(mutex);
         return terminal->pubsync();
     }
 
@@ -105,6 +114,7 @@ private:
 
     void Put(const std::string& text) { terminal->sputn(text.data(), static_cast<std::streamsize>(text.size())); }
 
+    std::mutex mutex;
     std::streambuf* terminal;
     std::uint32_t percent = 0;
     std::string message;

@@ -10,7 +10,8 @@ namespace HV {
 /// A bar on the last line of a terminal, below whatever else the run prints there.
 ///
 /// While it lives, what is written to `terminal` goes through it: a text that comes pushes the bar away, and the bar
-/// returns below the text's last line. One thread writes and reports. The bar's last state stays on the terminal.
+/// returns below the text's last line. Texts and reports may come from several threads. The bar's last state stays on
+/// the terminal, on a line of its own.
 class ProgressBar : public ProgressListenerInterface {
 public:
     explicit ProgressBar(std::ostream& terminal);
