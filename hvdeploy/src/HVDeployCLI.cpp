@@ -239,8 +239,9 @@ int DeployCLI::DeployFile(const fs::path& file) {
 int DeployCLI::DeployFolder(fs::path dir) {
     if (!IsDirectory(dir)) {
         const std::string text = dir.string();
-        if (text.size() > 1 && text.front() == '"') {
-            dir = fs::path(text.substr(1, text.size() - 2));
+        if (!text.empty() && text.front() == '"') {
+            // The last character goes whatever it is.
+            dir = fs::path(text.size() > 1 ? text.substr(1, text.size() - 2) : "");
         }
         if (!IsDirectory(dir)) {
             HVL_LOG(Error, "not a directory: " << dir);
