@@ -2,6 +2,11 @@
 
 SHELL := /bin/bash
 .DEFAULT_GOAL := help
+
+# One checkout's compilations serve another's: the compiler cache looks at paths from the checkout on.
+export CCACHE_BASEDIR := $(CURDIR)
+export CCACHE_NOHASHDIR := 1
+
 .PHONY: help setup demo demo-windows test test-hosted test-asan test-tsan test-windows bench format tidy clean
 
 help:
