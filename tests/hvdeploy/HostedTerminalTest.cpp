@@ -140,6 +140,9 @@ TEST_F(TerminalTest, PrintsAListAboveTheBar) {
 }
 
 /// A run that stands in a script, which does not hear of the interrupt and ends when the test lets it.
+///
+/// The script keeps talking: a thread sanitizer hands signals over only between two calls of the runtime, so a reader
+/// that waits for a silent script would never hear of the interrupt.
 class InterruptTest : public TerminalTest {
 protected:
     InterruptTest() {
@@ -147,15 +150,17 @@ protected:
         const std::string go = machine.HostName(R"(C:\go)");
         (void)Glow()
             .Postflight("trap '' INT TERM; : > " + machine.HostName(R"(C:\up)") + "; while [ ! -e " + go +
-                        " ]; do sleep 0.05; done")
+                        " ]; do echo waiting; sleep 0.05; done")
             .Payload("resource")
             .To("programdata", "Halvorn")
             .File("Second.txt", "second")
             .WriteTo(R"(C:\Packages)");
     }
 
-    /// Comes back once the script is there and has shut its ears.
-    void WaitForTheScript() const {
+    /// Comes back once the script is there and has shut its ears. All before is read: an interrupt empties the
+    /// terminal.
+    void WaitForTheScript(Terminal& terminal) const {
+        ASSERT_TRUE(terminal.Shows("Running postflight command")) << terminal.Output();
         for (int waited = 0; !machine.Exists(R"(C:\up)"); ++waited) {
             ASSERT_LT(waited, 6000) << "the script did not start";
             usleep(10'000);
@@ -177,7 +182,7 @@ protected:
 
 TEST_F(InterruptTest, UndoesTheRunAfterControlC) {
     Terminal terminal({R"(dir=C:\Packages)"});
-    WaitForTheScript();
+    WaitForTheScript(terminal);
     EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn\Glow.txt)"), "new");
     terminal.Type('\x03');
     ExpectUndone(terminal);
@@ -185,7 +190,7 @@ TEST_F(InterruptTest, UndoesTheRunAfterControlC) {
 
 TEST_F(InterruptTest, GoesOnUndoingAfterASecondControlC) {
     Terminal terminal({R"(dir=C:\Packages)"});
-    WaitForTheScript();
+    WaitForTheScript(terminal);
     terminal.Type('\x03');
     ASSERT_TRUE(terminal.Shows("CRIT hvdeploy-detail : Cancel invoked")) << terminal.Output();
     terminal.Type('\x03');
