@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <boost/exception/all.hpp>
+#include <log4cpp/Appender.hh>
 #include <log4cpp/Category.hh>
 #include <log4cpp/Priority.hh>
 
@@ -31,6 +32,8 @@ protected:
     ~LoggingTest() override { Reset(); }
 
     static void Reset() {
+        // What a property file brings is owned by nobody and would keep its file open.
+        log4cpp::Appender::closeAll();
         for (Category* category : {&HVL::Log::General(), &HVL::Log::Detail()}) {
             category->removeAllAppenders();
             category->setPriority(Priority::NOTSET);
