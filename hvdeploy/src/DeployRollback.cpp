@@ -30,13 +30,13 @@ std::wstring KeyOf(const fs::path& path) {
     return key;
 }
 
-// The way back goes on whatever happens, so what the filesystem library throws is one more failed step here.
+// The way back goes on whatever happens, so what the filesystem library throws is one more failed step here. What
+// cannot be put back has no message of its own, whichever way the move tells of it.
 void MoveBack(const fs::path& stashed, const fs::path& original) {
     try {
-        // What cannot be put back has no message of its own.
         (void)FileUtils::MoveFileOrDirectory(stashed.string(), original.string());
-    } catch (const std::exception& error) {
-        HVL_LOG(Warn, error.what());
+    } catch (const std::exception&) {
+        return;
     }
 }
 

@@ -115,6 +115,24 @@ TEST_F(RollbackTest, RunsTwiceQuietly) {
     EXPECT_EQ(log.LinesStartingWith("WARN").size(), 0U) << log.Text();
 }
 
+// Volumes are told apart by their texts, so the drive in lower case is another one: the move is a copy there, and a
+// copy onto a file that is there throws.
+TEST_F(RollbackTest, GoesOnWithoutAWordPastAnItemThatCannotGoBack) {
+    machine.Has(R"(C:\Data\first.dll)", "old");
+    machine.Has(R"(C:\Data\second.dll)", "old");
+    HV::DeployRollback rollback;
+    rollback.StashExistingFile(fs::path(R"(c:\Data\first.dll)"));
+    rollback.StashExistingFile(fs::path(R"(c:\Data\second.dll)"));
+    machine.Has(R"(C:\Data\first.dll)", "in the way");
+    log.Clear();
+    rollback.Rollback();
+    EXPECT_EQ(machine.Content(R"(C:\Data\first.dll)"), "in the way");
+    EXPECT_EQ(machine.Content(R"(C:\Data\second.dll)"), "old");
+    EXPECT_EQ(log.Lines(), (std::vector<std::string>{DebugLine("HV::DeployRollback::HV::DeployRollback::Rollback"),
+                                                     DebugLine(R"(Restoring original file at "c:\Data\first.dll")"),
+                                                     DebugLine(R"(Restoring original file at "c:\Data\second.dll")")}));
+}
+
 TEST_F(RollbackTest, BringsBackANameThatIsLongerThanItsStashName) {
     const std::string path = R"(C:\Data\a name of a plug-in that is longer than thirty characters.aex)";
     machine.Has(path, "old");
