@@ -174,9 +174,34 @@ TEST_F(HostedUndoTest, AFullDiskLeavesTheMachineAsItWas) {
     EXPECT_EQ(outcome.temp, std::vector<std::string>{});
 }
 
+TEST_F(HostedUndoTest, AFolderThatMeetsAFileItCannotMoveFailsWithTheCopysCode) {
+    Machine machine;
+    const std::string inTheWay = R"(C:\ProgramData\Halvorn\Glow.bundle)";
+    machine.Has(inTheWay, "a file that somebody holds");
+    (void)PackageBuilder("com.halvorn.glow")
+        .Payload("resource")
+        .To("programdata", "Halvorn")
+        .Folder("Glow.bundle")
+        .File("Glow.bundle/Glow.dll", "x")
+        .Source("Glow.bundle")
+        .WriteTo(kPackages);
+    MachineFaults faults(machine);
+    faults.Lock(inTheWay);
+    const Outcome outcome = Run(machine);
+    EXPECT_EQ(outcome.result, -2);
+    EXPECT_TRUE(Has(outcome, kNotStashed)) << Text(outcome);
+    EXPECT_TRUE(Has(outcome, ErrorLine("File copy failed with error code -1"))) << Text(outcome);
+    EXPECT_EQ(machine.Content(inTheWay), "a file that somebody holds");
+}
+
 TEST_F(HostedUndoTest, AStashThatCannotBeMadeKeepsTheEngineFromStarting) {
     const Machine machine;
     MachineFaults faults(machine);
     faults.FailNth(Operation::Create, 1);
-    EXPECT_THROW(HV::Deploy(nullptr), std::runtime_error);
+    try {
+        const HV::Deploy engine(nullptr);
+        FAIL() << "nothing was thrown";
+    } catch (const std::runtime_error& error) {
+        EXPECT_STREQ(error.what(), "Failed to create stash directory for rollback.");
+    }
 }

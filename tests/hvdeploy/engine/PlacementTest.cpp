@@ -1,4 +1,5 @@
 // Where the files of one payload go: folders of hosts, system directories, the applications' directory.
+#include "platform/win32.h"
 #include "tests/hvdeploy/engine/EngineTest.h"
 
 namespace {
@@ -232,6 +233,13 @@ TEST_F(PlacementTest, RefusesDirectoriesOfTheOtherSystemAndUnknownOnes) {
         ++count;
     }
     EXPECT_EQ(count, 9U);
+    EXPECT_EQ(PlacedFiles(), Paths{});
+}
+
+TEST_F(PlacementTest, FindsNoPathForADirectoryThatTheEnvironmentDoesNotName) {
+    SetEnvironmentVariableA("LOCALAPPDATA", nullptr);
+    EXPECT_EQ(Install({In("localappdata")}), -2);
+    EXPECT_TRUE(log.Has(ErrorLine("no path found for target sysdir value: localappdata"))) << log.Text();
     EXPECT_EQ(PlacedFiles(), Paths{});
 }
 
