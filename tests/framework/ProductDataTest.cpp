@@ -87,9 +87,12 @@ TEST(ProductData, RefusesASyntaxErrorAndStaysAsItWas) {
 
 TEST(ProductData, ThrowsWhenTheTextIsNoObject) {
     ProductData product;
+    int cases = 0;
     for (const char* json : {"[1, 2]", "\"text\"", "7", "null"}) {
         EXPECT_THROW((void)product.ReadJSON(json), std::runtime_error) << json;
+        ++cases;
     }
+    EXPECT_EQ(cases, 4);
 }
 
 TEST(ProductData, ThrowsWhenAnInstalledPathIsNoString) {
