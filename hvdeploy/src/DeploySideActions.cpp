@@ -74,6 +74,29 @@ bool Exists(const std::string& path) {
     return FileUtils::FileExists(path) || FileUtils::DirectoryExists(path);
 }
 
+/// What a line is called in the log: at the start of a text, and inside one.
+struct LineKind {
+    const char* title;
+    const char* noun;
+};
+
+// Gives 1 when the line succeeded, `result` when it failed and may fail, -2 when it failed and must not.
+EngineResult RunLine(const std::string& line, const PayloadScript& script, const LineKind& kind, EngineResult result) {
+    std::string output;
+    const int code = RunCommandCapture(line, output);
+    HVL_LOG(Debug, kind.title << " output: [id: " << script.id << "] \n" << output);
+    if (code == 0) {
+        HVL_LOG(Debug, "Script execution succeeded");
+        return kPlaced;
+    }
+    if (script.failOnError) {
+        HVL_LOG(Error, kind.noun << " returned " << code);
+        return kPlacementFailed;
+    }
+    HVL_LOG(Warn, script.id << " execution returned " << code << ". Continuing");
+    return result;
+}
+
 // Tells running programs that the environment may have changed. Sent for every entry, whatever key it wrote.
 void AnnounceEnvironmentChange() {
     SendMessageTimeoutA(HWND_BROADCAST, WM_SETTINGCHANGE, 0, reinterpret_cast<LPARAM>("Environment"), SMTO_ABORTIFHUNG,
@@ -85,38 +108,17 @@ void AnnounceEnvironmentChange() {
 EngineResult Deploy::RunPreOrPostflight(const PayloadScript& script, const Package& package) {
     TraceEntry(kOwner, "RunPreOrPostflight");
     EngineResult result = kNothingDone;
-    std::string output;
     if (!script.source.empty()) {
         HVL_LOG(Debug, "Running payload script: [id: " << script.id << "]");
         const std::string path = FileUtils::JoinPath(package.extractedPath.string(), script.source);
         HVL_LOG(Debug, "Running payload script: [id: " << script.id << "] : '" << path << "'");
-        const int code = RunCommandCapture("\"" + path + "\"", output);
-        HVL_LOG(Debug, "Script output: [id: " << script.id << "] \n" << output);
-        if (code == 0) {
-            HVL_LOG(Debug, "Script execution succeeded");
-            result = kPlaced;
-        } else if (script.failOnError) {
-            HVL_LOG(Error, "script returned " << code);
-            return kPlacementFailed;
-        } else {
-            HVL_LOG(Warn, script.id << " execution returned " << code << ". Continuing");
-        }
+        result = RunLine("\"" + path + "\"", script, {"Script", "script"}, result);
     }
-    if (!script.command.empty()) {
+    if (!script.command.empty() && !IsFailure(result)) {
         // The wording holds for the commands of preflights too.
         HVL_LOG(Debug, "Running postflight command: [id:" << script.id << "]");
         HVL_LOG(Debug, "Postflight command: " << script.command);
-        const int code = RunCommandCapture(script.command, output);
-        HVL_LOG(Debug, "Command output: [id: " << script.id << "] \n" << output);
-        if (code == 0) {
-            HVL_LOG(Debug, "Script execution succeeded");
-            result = kPlaced;
-        } else if (script.failOnError) {
-            HVL_LOG(Error, "command returned " << code);
-            result = kPlacementFailed;
-        } else {
-            HVL_LOG(Warn, script.id << " execution returned " << code << ". Continuing");
-        }
+        result = RunLine(script.command, script, {"Command", "command"}, result);
     }
     return result;
 }
