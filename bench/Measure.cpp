@@ -1,0 +1,144 @@
+#include "bench/Measure.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <stdexcept>
+
+#include "bench/Process.h"
+#include "bench/SuiteMaker.h"
+
+namespace HVBench {
+namespace {
+
+namespace disk = std::filesystem;
+
+constexpr std::size_t kMegabyte = std::size_t{1} << 20;
+
+double Median(std::vector<double> values) {
+    std::ranges::sort(values);
+    return values[values.size() / 2];
+}
+
+std::string Program(const Place& place, const char* name) {
+    return (place.programs / name).string();
+}
+
+/// An empty folder for a machine. What the last one held is removed before the clock runs.
+std::string Fresh(const disk::path& folder) {
+    disk::remove_all(folder);
+    disk::create_directories(folder);
+    return folder.string();
+}
+
+/// The arguments of an installation as users start it: with a log, at the level that holds without a word.
+std::vector<std::string> InstallCommand(const Place& place, const disk::path& packages) {
+    return {Program(place, "hvdeploy"), "dir=" + packages.string(), "log=C:\\ProgramData\\Halvorn\\Logs\\bench.log"};
+}
+
+// --- A suite against the same work by standard tools
+
+constexpr int kInstallPairs = 5;
+constexpr SuiteShape kSuite{14, 200, 8 * kMegabyte, 48 * 1024, false, 7};
+
+/// For each package: unpack it to a folder of its own, copy the payload to its place, remove the folder.
+constexpr const char* kStandardTools =
+    R"(set -e; n=0; for p in "$1"/*.hvpkg; do n=$((n+1)); mkdir -p "$2/temp" "$2/target/$n"; )"
+    R"(unzip -q "$p" -d "$2/temp/$n"; cp -r "$2/temp/$n/payload" "$2/temp/$n/history" "$2/target/$n"; )"
+    R"(rm -r "$2/temp/$n"; done)";
+
+std::vector<Figure> TakeInstall(const Place& place) {
+    const disk::path packages = place.work / "packages";
+    MakeSuite(kSuite, Program(place, "hvpack"), place.work, packages);
+    std::vector<double> ratios;
+    std::vector<double> peaks;
+    for (int pair = 0; pair < kInstallPairs; ++pair) {
+        const std::string machine = Fresh(place.work / "machine");
+        const Run ours = RunProgram(InstallCommand(place, packages), machine);
+        const std::string folder = Fresh(place.work / "machine");
+        const Run theirs = RunProgram({"sh", "-c", kStandardTools, "sh", packages.string(), folder}, folder);
+        ratios.push_back(ours.seconds / theirs.seconds);
+        peaks.push_back(static_cast<double>(ours.peakKilobytes) / 1024);
+    }
+    const double largest = static_cast<double>(kSuite.pluginSize) / static_cast<double>(kMegabyte);
+    return {{"250 MB suite: time against unzip, cp, rm", Median(ratios), 0.9},
+            {"250 MB suite: peak memory above the largest entry, MB", std::ranges::max(peaks) - largest, 24}};
+}
+
+// --- What a file costs among many, and what a package does
+
+/// Takes turns between a large run and several small ones, and gives how many times as much one of `large` things costs
+/// as one of `small`. `run` gives the seconds of a run of the given suite.
+double CostRatio(int large, int small, const std::function<double(int)>& run) {
+    constexpr int kRounds = 3;
+    constexpr int kSmallRuns = 5;
+    std::vector<double> ratios;
+    for (int round = 0; round < kRounds; ++round) {
+        std::vector<double> few;
+        for (int turn = 0; turn < kSmallRuns; ++turn) {
+            few.push_back(run(small) / small);
+        }
+        ratios.push_back(run(large) / large / Median(few));
+    }
+    return Median(ratios);
+}
+
+std::vector<Figure> TakeFiles(const Place& place) {
+    constexpr int kMany = 100000;
+    constexpr int kFew = 1000;
+    for (const int files : {kMany, kFew}) {
+        MakeSuite({1, files}, Program(place, "hvpack"), place.work, place.work / std::to_string(files));
+    }
+    const double ratio = CostRatio(kMany, kFew, [&](int files) {
+        const std::string machine = Fresh(place.work / "machine");
+        return RunProgram(InstallCommand(place, place.work / std::to_string(files)), machine).seconds;
+    });
+    return {{"a file of 100,000 against one of 1,000: time", ratio, 1.3}};
+}
+
+/// The suite is there already, so the run that is measured stashes everything, replaces it, and puts it all back.
+std::vector<Figure> TakePackages(const Place& place) {
+    constexpr int kMany = 1000;
+    constexpr int kFew = 10;
+    for (const int packages : {kMany, kFew}) {
+        SuiteShape shape{packages, 10};
+        shape.lastFails = true;
+        MakeSuite(shape, Program(place, "hvpack"), place.work, place.work / std::to_string(packages));
+    }
+    const double ratio = CostRatio(kMany, kFew, [&](int packages) {
+        const std::string machine = Fresh(place.work / "machine");
+        const std::vector<std::string> install = InstallCommand(place, place.work / std::to_string(packages));
+        std::vector<std::string> before = install;
+        before.push_back(std::string("skip=") + kFailingPackage);
+        RunProgram(before, machine);
+        return RunProgram(install, machine, 1).seconds;
+    });
+    return {{"a package of 1,000 against one of 10, rolled back: time", ratio, 1.3}};
+}
+
+// --- The digest
+
+constexpr int kDigestPairs = 9;
+constexpr std::size_t kDigestSize = 256 * kMegabyte;
+
+std::vector<Figure> TakeMd5(const Place& place) {
+    const std::string file = (place.work / "digest.bin").string();
+    WriteFile(file, MakeBytes(kDigestSize, 3));
+    const std::string machine = Fresh(place.work / "machine");
+    std::vector<double> ratios;
+    for (int pair = 0; pair < kDigestPairs; ++pair) {
+        const Run ours = RunProgram({Program(place, "hvbench"), "--digest", file}, machine);
+        const Run theirs = RunProgram({"md5sum", file}, machine);
+        ratios.push_back(theirs.seconds / ours.seconds);
+    }
+    return {{"MD5 of a file: rate against md5sum", Median(ratios), 0.9, true}};
+}
+
+}  // namespace
+
+const std::vector<Measurement>& Measurements() {
+    static const std::vector<Measurement> all = {
+        {"install", TakeInstall}, {"files", TakeFiles}, {"packages", TakePackages}, {"md5", TakeMd5}};
+    return all;
+}
+
+}  // namespace HVBench
