@@ -23,9 +23,11 @@ std::string Program(const Place& place, const char* name) {
     return (place.programs / name).string();
 }
 
-/// An empty folder for a machine. What the last one held is removed before the clock runs.
-std::string Fresh(const disk::path& folder) {
-    disk::remove_all(folder);
+/// A new folder for a machine. Those of earlier runs stay until the end: after a large removal the file system is slow
+/// to give out what it has just taken back, and the run that is measured would pay for it.
+std::string Fresh(const Place& place) {
+    static int number = 0;
+    const disk::path folder = place.work / ("machine-" + std::to_string(++number));
     disk::create_directories(folder);
     return folder.string();
 }
@@ -52,9 +54,9 @@ std::vector<Figure> TakeInstall(const Place& place) {
     std::vector<double> ratios;
     std::vector<double> peaks;
     for (int pair = 0; pair < kInstallPairs; ++pair) {
-        const std::string machine = Fresh(place.work / "machine");
+        const std::string machine = Fresh(place);
         const Run ours = RunProgram(InstallCommand(place, packages), machine);
-        const std::string folder = Fresh(place.work / "machine");
+        const std::string folder = Fresh(place);
         const Run theirs = RunProgram({"sh", "-c", kStandardTools, "sh", packages.string(), folder}, folder);
         ratios.push_back(ours.seconds / theirs.seconds);
         peaks.push_back(static_cast<double>(ours.peakKilobytes) / 1024);
@@ -89,7 +91,7 @@ std::vector<Figure> TakeFiles(const Place& place) {
         MakeSuite({1, files}, Program(place, "hvpack"), place.work, place.work / std::to_string(files));
     }
     const double ratio = CostRatio(kMany, kFew, [&](int files) {
-        const std::string machine = Fresh(place.work / "machine");
+        const std::string machine = Fresh(place);
         return RunProgram(InstallCommand(place, place.work / std::to_string(files)), machine).seconds;
     });
     return {{"a file of 100,000 against one of 1,000: time", ratio, 1.3}};
@@ -105,7 +107,7 @@ std::vector<Figure> TakePackages(const Place& place) {
         MakeSuite(shape, Program(place, "hvpack"), place.work, place.work / std::to_string(packages));
     }
     const double ratio = CostRatio(kMany, kFew, [&](int packages) {
-        const std::string machine = Fresh(place.work / "machine");
+        const std::string machine = Fresh(place);
         const std::vector<std::string> install = InstallCommand(place, place.work / std::to_string(packages));
         std::vector<std::string> before = install;
         before.push_back(std::string("skip=") + kFailingPackage);
@@ -123,7 +125,7 @@ constexpr std::size_t kDigestSize = 256 * kMegabyte;
 std::vector<Figure> TakeMd5(const Place& place) {
     const std::string file = (place.work / "digest.bin").string();
     WriteFile(file, MakeBytes(kDigestSize, 3));
-    const std::string machine = Fresh(place.work / "machine");
+    const std::string machine = Fresh(place);
     std::vector<double> ratios;
     for (int pair = 0; pair < kDigestPairs; ++pair) {
         const Run ours = RunProgram({Program(place, "hvbench"), "--digest", file}, machine);
