@@ -185,8 +185,9 @@ void DeployCLI::InitLogging(int argc, const char* const* argv) {
     }
     const std::string fileName = LogFileFromArgs(argc, argv);
     if (!fileName.empty()) {
-        // A folder that cannot be made leaves the run without a log file; it goes on all the same.
-        (void)FileUtils::CreateDirectories(FileUtils::GetParentPath(fileName));
+        // A folder that cannot be made leaves the run without a log file; it goes on all the same. Both separators are
+        // what people type.
+        (void)FileUtils::CreateDirectories(fs::path(fileName).parent_path().make_preferred().string());
     }
     for (const char* const name : kCategories) {
         log4cpp::Category& category = log4cpp::Category::getInstance(name);

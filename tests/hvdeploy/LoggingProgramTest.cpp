@@ -36,6 +36,12 @@ TEST(LoggingOfTheProgram, WritesToTheFileWhatItPrints) {
     EXPECT_TRUE(Has(result.output, " WARN hvdeploy-detail : ListPackages not yet implemented.\n")) << result.output;
 }
 
+TEST(LoggingOfTheProgram, MakesTheFoldersOfALogThatIsNamedWithSlashes) {
+    const Machine machine;
+    (void)RunProgram("hvdeploy", {"list=packages", "log=C:/Logs/deep/run.log"});
+    EXPECT_TRUE(Has(machine.Content(R"(C:\Logs\deep\run.log)"), "ListPackages not yet implemented."));
+}
+
 TEST(LoggingOfTheProgram, GoesOnInTheSameFile) {
     const Machine machine;
     (void)RunProgram("hvdeploy", {"list=packages", R"(log=C:\Logs\run.log)"});
