@@ -16,6 +16,8 @@ namespace disk = std::filesystem;
 /// People keep folders apart, not one of a hundred thousand files.
 constexpr int kFilesPerFolder = 200;
 
+constexpr const char* kFailingProduct = "postflight-fails";
+
 std::string Numbered(const char* format, int number) {
     std::array<char, 64> text{};
     std::snprintf(text.data(), text.size(), format, number);
@@ -72,10 +74,10 @@ void MakePackage(const SuiteShape& shape, int number, const std::string& hvpack,
 }
 
 void MakeFailingPackage(const std::string& hvpack, const disk::path& work, const disk::path& packages) {
-    const disk::path folder = work / "zz.fails";
+    const disk::path folder = work / kFailingProduct;
     disk::create_directories(folder / "payload");
-    WriteFile(folder / "_hvmanifest.xml", Manifest("zz.fails", Payload("lost", "payload", "nowhere", "Lost")));
-    Pack(hvpack, folder, packages, "zz.fails");
+    WriteFile(folder / "_hvmanifest.xml", Manifest(kFailingProduct, Payload("lost", "payload", "nowhere", "Lost")));
+    Pack(hvpack, folder, packages, kFailingProduct);
 }
 
 }  // namespace

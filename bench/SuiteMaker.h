@@ -23,8 +23,9 @@ struct SuiteShape {
 void MakeSuite(const SuiteShape& shape, const std::string& hvpack, const std::filesystem::path& work,
                const std::filesystem::path& packages);
 
-/// The name of the package that fails.
-inline constexpr const char* kFailingPackage = "zz.fails.hvpkg";
+/// The file of the package that fails. Its name puts it into the last phase, behind all others: within a phase packages
+/// come in the order in which the folder lists them, which may be any.
+inline constexpr const char* kFailingPackage = "postflight-fails.hvpkg";
 
 /// `size` bytes that a packer brings to about half, as programs and presets are: words of a few bytes that come again,
 /// between others that do not.
