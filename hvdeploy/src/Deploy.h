@@ -56,8 +56,8 @@ public:
     /// Whether the conditions of `payload` let it be placed: 0 passes it over, 1 and -1 (none held) place it.
     int CheckPayloadPreconditions(const Payload& payload) const;
 
-    /// Runs the script file and then the command of `script`. Gives 1 when one of them succeeded, 0 when there is neither
-    /// or none succeeded and none had to, -2 as soon as one that has to succeed fails. Waits without a limit.
+    /// Runs the script file and then the command of `script`. Gives 1 when one of them succeeded, 0 when there is
+    /// neither or none succeeded and none had to, -2 as soon as one that has to succeed fails. Waits without a limit.
     EngineResult RunPreOrPostflight(const PayloadScript& script, const Package& package);
 
     /// Writes one registry value. Gives 0 when it is written or not meant for this system, -1 when its key cannot be
