@@ -1,0 +1,79 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "hosts/HostAppCheck.h"
+#include "hvframework/ProductData.h"
+#include "system/Processes.h"
+#include "system/XMLStringsResource.h"
+
+namespace HV {
+
+/// One package that has passed every check.
+struct PackageInfo {
+    std::string identifier;
+    std::string path;
+    std::string displayName;
+    std::string version;
+    bool show = false;  // a product that the user sees
+    bool requiresHost = false;
+    bool hostFound = false;
+    std::vector<std::string> hostRefs;  // hosts of this machine that the package will use
+};
+
+/// The data that the wizard works on: hosts, packages, the suite, the texts. It touches no window.
+///
+/// There is one in a process. The main thread alone uses it; the engine reads everything again for itself.
+class InstallerModel {
+public:
+    /// The one model, made and loaded by the first call: hosts are detected, every package is digested and checked.
+    static InstallerModel& Instance();
+
+    /// Drops the model, so that the next Instance() makes and loads another. A process that shows one wizard has no use
+    /// for it; one that walks through many, as tests do, has.
+    static void Forget();
+
+    /// The text of a key, its variables filled in; empty for an unknown key.
+    [[nodiscard]] std::string GetString(const std::string& key) const;
+
+    /// The identifiers of the packages that the user sees, in order.
+    [[nodiscard]] std::vector<std::string> ShownIdentifiers() const;
+
+    /// The package with exactly this identifier, or an empty record.
+    [[nodiscard]] PackageInfo FindPackage(const std::string& identifier) const;
+
+    /// Whether there are shown packages and all of them lack their hosts.
+    [[nodiscard]] bool AllProductsLackHosts() const;
+
+    /// Whether any shown package lacks its hosts.
+    [[nodiscard]] bool SomeProductLacksHost() const;
+
+    /// Whether the manager application runs now. Takes a new snapshot of the processes.
+    [[nodiscard]] bool ManagerIsRunning();
+
+    /// Fills `out` with the running hosts of all packages, chosen or not, and returns whether there are any. Takes a
+    /// new snapshot unless no package uses a host.
+    [[nodiscard]] bool FindRunningHosts(std::vector<ProcessRecord>& out);
+
+    bool valid = false;  // the folder was scanned and every package is good
+    std::string packagesDirectory;
+    std::vector<std::string> packageFiles;  // full paths, in directory order
+    std::string suiteJsonPath;
+    std::vector<PackageInfo> packages;  // shown ones first, each group by display name
+    HostAppCheck hostCheck;
+    XMLStringsResource strings;
+    HVL::ProductData suite;
+    bool loaded = false;
+    Processes processes;
+
+private:
+    InstallerModel() = default;
+
+    void Load();
+    [[nodiscard]] bool ScanPackages();
+    [[nodiscard]] bool ValidatePackages();
+    void LoadStringsResource();
+};
+
+}  // namespace HV
