@@ -174,7 +174,12 @@ TEST_F(HostileExecutable, IsPassedOverWhenAPartLeadsNowhere) {
     EXPECT_EQ(checked, 30);
 }
 
-TEST(VersionBlock, HasItsRootValueAndNoOtherPart) {
+class VersionBlock : public testing::Test {
+protected:
+    Machine machine;
+};
+
+TEST_F(VersionBlock, HasItsRootValueAndNoOtherPart) {
     const std::string path = TestExecutable("both-versions");
     const DWORD size = GetFileVersionInfoSizeA(path.c_str(), nullptr);
     ASSERT_GT(size, 0U);
@@ -188,7 +193,7 @@ TEST(VersionBlock, HasItsRootValueAndNoOtherPart) {
     EXPECT_FALSE(VerQueryValueA(block.data(), "\\StringFileInfo", &value, &length));
 }
 
-TEST(VersionBlock, DoesNotOverrunABufferThatIsTooSmall) {
+TEST_F(VersionBlock, DoesNotOverrunABufferThatIsTooSmall) {
     const std::string path = TestExecutable("both-versions");
     std::string block(GetFileVersionInfoSizeA(path.c_str(), nullptr) - 1, '\0');
     EXPECT_FALSE(GetFileVersionInfoA(path.c_str(), 0, static_cast<DWORD>(block.size()), block.data()));
