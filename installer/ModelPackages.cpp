@@ -1,0 +1,210 @@
+// What the model knows of the packages folder: which files are there, whether each is what this build may install, and
+// what the wizard has to know of it.
+#include <algorithm>
+#include <iostream>
+#include <optional>
+#include <set>
+#include <tuple>
+#include <utility>
+
+#include "hvframework/FileUtils.h"
+#include "hvframework/Log.h"
+#include "installer/InstallerModel.h"
+#include "installer/StartUp.h"
+#include "package/Package.h"
+#include "package/ValidationTable.h"
+#include "platform/filesystem.h"
+
+namespace HV {
+namespace {
+
+using HVL::FileUtils::GetFileMD5;
+using HVL::FileUtils::GetFileName;
+
+/// What the walk over the packages folder finds.
+struct FolderFiles {
+    std::vector<std::string> packageFiles;
+    std::string suiteJsonPath;
+};
+
+// The case of an extension counts here, though the engine passes over it: the name of a package has to stand in the
+// table of this build, to the letter.
+void AddFile(const fs::path& path, FolderFiles& files) {
+    const std::string extension = path.extension().string();
+    if (extension == ".zip" || extension == ".hvpkg") {
+        files.packageFiles.push_back(path.string());
+    } else if (extension == ".json" && files.suiteJsonPath.empty()) {
+        files.suiteJsonPath = path.string();
+    } else if (extension == ".json") {
+        std::cerr << "WARNING: found additional json file at root level of packages dir: " << path << std::endl;
+    }
+}
+
+/// Lists the files directly in the folder; whether it could be listed to its end.
+bool ListFolder(const std::string& folder, FolderFiles& files) {
+    boost::system::error_code error;
+    fs::directory_iterator entry(fs::path(folder), error);
+    while (!error && entry != fs::directory_iterator()) {
+        boost::system::error_code unknown;
+        if (fs::is_regular_file(entry->status(unknown))) {
+            AddFile(entry->path(), files);
+        }
+        entry.increment(error);
+    }
+    return !error;
+}
+
+// JSON that is no object throws; for the user of the wizard it is a suite file that cannot be read, like any other.
+bool ParseSuite(const std::string& json, HVL::ProductData& suite) {
+    try {
+        return suite.ReadJSON(json);
+    } catch (const std::exception&) {
+        return false;
+    }
+}
+
+bool ReadSuite(const std::string& path, HVL::ProductData& suite) {
+    std::string json;
+    if (!HVL::FileUtils::FileExists(path) || HVL::FileUtils::ReadFileToString(path, json) != 0) {
+        return false;
+    }
+    if (!ParseSuite(json, suite)) {
+        std::cerr << "ERROR: failed to read suite data from file " << path << std::endl;
+        return false;
+    }
+    return true;
+}
+
+/// Whether the file is one of this release, byte for byte.
+bool IsReleased(const std::string& path, const std::set<std::string>& releasedNames) {
+    const std::string name = GetFileName(path);
+    if (!releasedNames.contains(name)) {
+        HVL_LOG(Error, "ERROR: " << name << " is not valid payload.");
+        return false;
+    }
+    ValidationInfo row;
+    GetValidationInfo(name, row);
+    if (GetFileMD5(path) != row.md5) {
+        HVL_LOG(Error, "validation of " << name << " failed.");
+        return false;
+    }
+    return true;
+}
+
+std::string PropertyOr(const Manifest& manifest, const std::string& key, const std::string& otherwise) {
+    const auto found = manifest.productData.find(key);
+    return found == manifest.productData.end() ? otherwise : found->second;
+}
+
+bool GoesIntoHosts(const Payload& payload) {
+    return payload.deployment == DeploymentType::HostPlugins || payload.deployment == DeploymentType::HostPresets ||
+           payload.deployment == DeploymentType::HostScripts;
+}
+
+bool NeedsNoHost(const Payload& payload) {
+    return payload.type != PayloadType::Plugin && !GoesIntoHosts(payload) && payload.hosts.empty();
+}
+
+// One host is enough to make the payload worth installing. The others are not looked at, so of several hosts of one
+// payload the user is asked to quit only the first that is there.
+void NoteFirstHost(const Payload& payload, const HostAppCheck& hostCheck, PackageInfo& info) {
+    const auto hostRef =
+        std::ranges::find_if(payload.hosts, [&](const std::string& ref) { return hostCheck.HasHost(ref); });
+    if (hostRef == payload.hosts.end()) {
+        return;
+    }
+    info.hostFound = true;
+    if (std::ranges::find(info.hostRefs, *hostRef) == info.hostRefs.end()) {
+        info.hostRefs.push_back(*hostRef);
+    }
+}
+
+// The order of the payloads counts: the first one that needs no host ends the look, and the hosts that were met before
+// it are still hosts that the package will use. A package without any payload for this system needs a host, and has
+// none: there is nothing in it that could be installed without one.
+void ClassifyForHosts(const std::vector<Payload>& payloads, const HostAppCheck& hostCheck, PackageInfo& info) {
+    info.requiresHost = true;
+    for (const Payload& payload : payloads) {
+        if (!payload.MatchesOS()) {
+            continue;
+        }
+        if (NeedsNoHost(payload)) {
+            info.requiresHost = false;
+            info.hostFound = false;
+            return;
+        }
+        NoteFirstHost(payload, hostCheck, info);
+    }
+}
+
+PackageInfo MakeInfo(const std::string& path, const Manifest& manifest, const HostAppCheck& hostCheck) {
+    PackageInfo info;
+    info.identifier = manifest.productId;
+    info.path = path;
+    info.show = manifest.policy.show;
+    info.version = PropertyOr(manifest, "version", manifest.productVersion);
+    info.displayName = PropertyOr(manifest, "display_name", info.identifier);
+    ClassifyForHosts(manifest.payloads, hostCheck, info);
+    return info;
+}
+
+/// Nothing when the package is bad; the log says why.
+std::optional<PackageInfo> ReadPackage(const std::string& path, const HostAppCheck& hostCheck) {
+    try {
+        Package package{fs::path(path)};
+        if (package.Validate(false)) {
+            return MakeInfo(path, package.manifest, hostCheck);
+        }
+    } catch (const std::exception& error) {
+        // The file has gone since it was listed.
+        HVL_LOG(Error, error.what());
+    }
+    return std::nullopt;
+}
+
+// Shown packages first. Names are compared byte by byte; packages of one name stay in the order of the folder.
+void SortForDisplay(std::vector<PackageInfo>& packages) {
+    const auto rank = [](const PackageInfo& package) {
+        return std::tuple<bool, const std::string&>(!package.show, package.displayName);
+    };
+    std::ranges::stable_sort(packages, {}, rank);
+}
+
+}  // namespace
+
+bool InstallerModel::ScanPackages() {
+    packagesDirectory = PackagesDirectoryPath();
+    FolderFiles files;
+    if (!HVL::FileUtils::DirectoryExists(packagesDirectory) || !ListFolder(packagesDirectory, files)) {
+        return false;
+    }
+    packageFiles = std::move(files.packageFiles);
+    suiteJsonPath = std::move(files.suiteJsonPath);
+    // The suite is read even where there is no package: its name stands in the window that says so.
+    return ReadSuite(suiteJsonPath, suite) && !packageFiles.empty();
+}
+
+// The first bad file ends it, and then there is no list of packages at all: the wizard offers all of a release or none.
+bool InstallerModel::ValidatePackages() {
+    std::vector<std::string> names;
+    GetValidationFileNames(names);
+    if (names.empty()) {
+        std::cerr << "Fatal error - this installer build does not include validation information." << std::endl;
+        return false;
+    }
+    const std::set<std::string> releasedNames(names.begin(), names.end());
+    std::vector<PackageInfo> good;
+    for (const std::string& path : packageFiles) {
+        const std::optional<PackageInfo> info =
+            IsReleased(path, releasedNames) ? ReadPackage(path, hostCheck) : std::nullopt;
+        if (!info) {
+            return false;
+        }
+        good.push_back(*info);
+    }
+    SortForDisplay(good);
+    packages = std::move(good);
+    return true;
+}
+
+}  // namespace HV

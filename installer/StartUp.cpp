@@ -1,0 +1,66 @@
+#include "installer/StartUp.h"
+
+#include "hvdeploy/src/Logging.h"
+#include "hvframework/FileUtils.h"
+#include "hvframework/Log.h"
+#include "hvframework/StringUtils.h"
+#include "installer/WizardToolkit.h"
+
+namespace HV {
+namespace {
+
+using namespace HVL;
+
+constexpr const char* kLogFileName = "Tessaly Suite Installer.log";
+constexpr unsigned kStopIcon = 16;  // of a beep and of a box, which then has the button OK
+
+std::string PropertyFileOfTheMachine() {
+    const std::string company = FileUtils::JoinPath(StringUtils::GetEnvironmentValue("ProgramData"), "Halvorn");
+    return FileUtils::JoinPath(FileUtils::JoinPath(company, "Installer"), "halvorn.logging.config");
+}
+
+// What fails here shows when the file is handed to log4cpp.
+std::string MakePropertyFile() {
+    const std::string folder = FileUtils::MakeTempPath("tmp", FileUtils::GetTempDirectory());
+    (void)FileUtils::CreateDirectories(folder);
+    const std::string file = folder + "\\hvinstaller.cfg";
+    (void)WriteLoggingConfig(file, kLogFileName, "");
+    return file;
+}
+
+// A folder of that name is nobody's configuration.
+std::string ChoosePropertyFile() {
+    const std::string file = PropertyFileOfTheMachine();
+    return FileUtils::FileExists(file) ? file : MakePropertyFile();
+}
+
+}  // namespace
+
+std::string PackagesDirectoryPath() {
+    return FileUtils::JoinPath(FileUtils::GetParentPath(ProgramPath()), "packages");
+}
+
+void StartLogging() {
+    const std::string file = ChoosePropertyFile();
+    // Twice, and it stays so: pairs are what the start of a wizard looks like to those who read its log. A property
+    // file that lets the test lines through gets each of them twice, and a refusal is reported twice. No other line is:
+    // the second round takes the appenders of the first away.
+    (void)ConfigureLogging(file);
+    (void)ConfigureLogging(file);
+    Log::General().setPriority(log4cpp::Priority::DEBUG);
+    Log::Detail().setPriority(log4cpp::Priority::DEBUG);
+}
+
+void RequirePackagesDirectory(WizardToolkit& toolkit) {
+    if (FileUtils::DirectoryExists(PackagesDirectoryPath())) {
+        return;
+    }
+    toolkit.MessageBeep(kStopIcon);
+    toolkit.MessageBoxA(nullptr,
+                        "This installer application has been moved. It must be run from its original folder "
+                        "containing a packages directory. The installer will now exit.",
+                        "Packages Directory Not Found", kStopIcon);
+    toolkit.ExitProcess(0);
+}
+
+}  // namespace HV
