@@ -41,6 +41,9 @@ public:
     /// One poll of the job: shows its progress, and ends the install when it has finished or failed.
     void OnProgressTimer();
 
+    /// Makes the page with the products to choose from. Throws std::runtime_error when there is one already.
+    void CreateSelectionPage();
+
     InstallerWindow* window = nullptr;
     WizardState state = WizardState::Welcome;
     bool agreed = false;
@@ -53,6 +56,41 @@ public:
     EULAWindowController* eulaController = nullptr;
 
 private:
+    // The way to the first page.
+    void MakeWindow(const std::string& caption, int showCommand);
+    void CheckPackagesAndHosts();
+
+    // The commands, and the steps that Continue takes.
+    [[nodiscard]] bool CanContinue();
+    [[nodiscard]] bool HasChoice() const;
+    void AgreeCommand();
+    void BackCommand();
+    void CancelCommand();
+    void ReadLicenseCommand();
+    void ContinueCommand();
+    void EnterSelection();
+    void EnterInstalling();
+
+    // What has to be quit before an install.
+    void RequireManagerClosed();
+    void RequireHostsClosed();
+    [[nodiscard]] bool AskToRetry(const std::string& title, const std::string& text);
+
+    // The install.
+    void CreateInstallingPage();
+    void StartInstall();
+    void ShowPercent(std::uint32_t percent);
+    void ShowStatus(const std::string& text);
+    void ShowFinalPage();
+
+    // The links of the last page.
+    void OpenWhatsNew();
+    void OpenResources();
+    void OpenUrl(const std::string& url);
+
+    [[noreturn]] void EndWith(InstallerWindow* owner, const std::string& title, const std::string& text);
+    [[nodiscard]] const char* FirstContinueText() const;
+
     WizardToolkit& toolkit_;
 };
 

@@ -1,0 +1,56 @@
+// How the wizard comes up: the window first, then what speaks against a run.
+#include "installer/WinWizardController.h"
+
+#include "installer/InstallerModel.h"
+#include "installer/WizardBoxes.h"
+
+namespace HV {
+
+WinWizardController::WinWizardController(WizardToolkit& toolkit) : toolkit_(toolkit) {}
+WinWizardController::~WinWizardController() = default;
+
+void WinWizardController::Initialize(int showCommand) {
+    const InstallerModel& model = InstallerModel::Instance();
+    MakeWindow(model.GetString("installer.title.noversion"), showCommand);
+    CheckPackagesAndHosts();
+    hasProductChoice = !model.ShownIdentifiers().empty();
+    toolkit_.SetContinueText(*window, FirstContinueText());
+}
+
+void WinWizardController::MakeWindow(const std::string& caption, int showCommand) {
+    window = toolkit_.CreateInstallerWindow(*this, caption);
+    welcomePage = toolkit_.CreateWelcomePage(*this, *window);
+    toolkit_.ShowWindow(WizardPart::MainWindow, showCommand);
+}
+
+void WinWizardController::CheckPackagesAndHosts() {
+    const InstallerModel& model = InstallerModel::Instance();
+    if (!model.valid) {
+        EndWith(nullptr, "Error: invalid installer packages.",
+                "This installer contains invalid packages and cannot be run.");
+    }
+    if (model.AllProductsLackHosts()) {
+        EndWith(nullptr, "Error: no hosts found.",
+                "This installer's products require host applications which are not installed on this computer.");
+    }
+    if (model.SomeProductLacksHost()) {
+        toolkit_.MessageBeep(kWarningBox);
+        toolkit_.MessageBoxA(nullptr,
+                             "Some products require host applications which are not installed on this computer. "
+                             "Selection of these products for install will be disabled.",
+                             "Warning: missing hosts.", kWarningBox);
+    }
+}
+
+const char* WinWizardController::FirstContinueText() const {
+    return hasProductChoice ? "Continue" : "Install";
+}
+
+// Status 0 says that the wizard itself did its part, whatever it had to tell.
+void WinWizardController::EndWith(InstallerWindow* owner, const std::string& title, const std::string& text) {
+    toolkit_.MessageBeep(kStopBox);
+    toolkit_.MessageBoxA(owner, text, title, kStopBox);
+    toolkit_.ExitProcess(0);
+}
+
+}  // namespace HV
