@@ -8,8 +8,11 @@
 #ifdef _WIN32
 #include "platform/windows/win32.h"
 #else
+#include "platform/hosted/access_control.h"
 #include "platform/hosted/command.h"
 #include "platform/hosted/console.h"
+#include "platform/hosted/processes.h"
+#include "platform/hosted/program.h"
 #include "platform/hosted/version_block.h"
 #include "platform/hosted/win32.h"
 #include "platform/hosted/window_messages.h"

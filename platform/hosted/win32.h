@@ -23,6 +23,12 @@ using LPVOID = void*;
 using PVOID = void*;
 using LPCVOID = const void*;
 using errno_t = int;
+using HANDLE = void*;
+using PHANDLE = HANDLE*;
+
+struct HINSTANCE__;
+using HMODULE = HINSTANCE__*;
+using PHMODULE = HMODULE*;
 
 struct HKEY__;
 using HKEY = HKEY__*;
@@ -60,9 +66,16 @@ inline constexpr LONG ERROR_NO_MORE_ITEMS = 259;
 inline constexpr LONG ERROR_DIRECTORY = 267;
 inline constexpr LONG ERROR_KEY_DELETED = 1018;
 inline constexpr LONG ERROR_UNSUPPORTED_TYPE = 1630;
+inline constexpr LONG ERROR_RESOURCE_NAME_NOT_FOUND = 1814;
 
 DWORD GetLastError();
 void SetLastError(DWORD error);
+
+// Handles of folders, processes and tokens, which the calls that open them describe.
+
+#define INVALID_HANDLE_VALUE (reinterpret_cast<HANDLE>(static_cast<std::intptr_t>(-1)))
+
+BOOL CloseHandle(HANDLE handle);
 
 // Environment. Names are compared without regard to case; a variable of the process comes before the machine's own.
 

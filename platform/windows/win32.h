@@ -9,9 +9,11 @@
 
 #include <windows.h>
 
+#include <aclapi.h>
 #include <direct.h>
 #include <errno.h>
 #include <io.h>
+#include <psapi.h>
 #include <stdio.h>
 
 // The headers turn these words into macros; the logic has operations and enumerators of the same names.
