@@ -3,12 +3,13 @@
 #include <filesystem>
 #include <sstream>
 
+#include "tests/support/Faults.h"
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
 #include "tools/hvpack/Commands.h"
 
 // Packages are often made where Windows' rules for names do not hold. On Windows no such folder can be there to begin
-// with, so these tests exist for the hosted target alone.
+// with, and no disk is full on demand, so these tests exist for the hosted target alone.
 
 namespace {
 
@@ -42,6 +43,31 @@ TEST(HvpackHosted, RefusesLinks) {
     std::filesystem::create_directory_symlink(machine.HostName(R"(C:\glow)"),
                                               machine.HostName(R"(C:\glow)") + "/itself");
     EXPECT_EQ(Refusal(), "hvpack: itself/ is neither a file nor a folder\n");
+}
+
+TEST(HvpackHosted, RefusesAReleaseWithTwoPackagesThatAreOneOnWindows) {
+    Machine machine;
+    (void)PackageBuilder("com.halvorn.glow").Named("glow.zip").WriteTo(R"(C:\packages)");
+    (void)PackageBuilder("com.halvorn.glow").Named("Glow.zip").WriteTo(R"(C:\packages)");
+    std::ostringstream out;
+    std::ostringstream err;
+    EXPECT_EQ(HVPack::RunCommand({"table", R"(C:\packages)"}, out, err), 1);
+    EXPECT_EQ(err.str(), "hvpack: Glow.zip and glow.zip are one name on Windows\n");
+    EXPECT_EQ(out.str(), "");
+}
+
+TEST(HvpackHosted, KeepsTheOlderTableWhenTheDiskIsFull) {
+    Machine machine;
+    (void)PackageBuilder("com.halvorn.glow").WriteTo(R"(C:\packages)");
+    machine.Has(R"(C:\rows.cpp)", "the older one");
+    MachineFaults faults(machine);
+    faults.LimitSpace(100);
+    std::ostringstream out;
+    std::ostringstream err;
+    EXPECT_EQ(HVPack::RunCommand({"table", R"(C:\packages)", R"(C:\rows.cpp)"}, out, err), 1);
+    EXPECT_EQ(err.str(), "hvpack: cannot write C:\\rows.cpp\n");
+    EXPECT_EQ(machine.Content(R"(C:\rows.cpp)"), "the older one");
+    EXPECT_FALSE(machine.Exists(R"(C:\rows.cpp.part)"));
 }
 
 }  // namespace

@@ -169,7 +169,8 @@ TEST_F(HvpackTest, DoesNotListWhatIsNoPackage) {
 
 TEST_F(HvpackTest, TellsHowItIsUsedWhenItDoesNotUnderstand) {
     const std::vector<std::vector<std::string>> lines{
-        {}, {"help"}, {"make"}, {"make", "a"}, {"check"}, {"make", "a", "b", "c"}, {"list"}, {"list", "a", "b"}};
+        {},       {"help"},           {"make"},  {"make", "a"},           {"check"}, {"make", "a", "b", "c"},
+        {"list"}, {"list", "a", "b"}, {"table"}, {"table", "a", "b", "c"}};
     std::size_t tried = 0;
     for (const auto& line : lines) {
         EXPECT_EQ(Run(line), 1);
@@ -177,7 +178,7 @@ TEST_F(HvpackTest, TellsHowItIsUsedWhenItDoesNotUnderstand) {
         EXPECT_EQ(out, "");
         ++tried;
     }
-    EXPECT_EQ(tried, 8U);
+    EXPECT_EQ(tried, 10U);
 }
 
 TEST_F(HvpackTest, LeavesLoggingAsItFoundIt) {

@@ -6,9 +6,11 @@
 #include <exception>
 
 #include "hvframework/Log.h"
-#include "package/Package.h"
 #include "package/ZipEntries.h"
+#include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/PackageMaker.h"
+#include "tools/hvpack/ReleaseTable.h"
+#include "tools/hvpack/SoundPackage.h"
 
 namespace HVPack {
 namespace {
@@ -16,7 +18,8 @@ namespace {
 constexpr const char* kUsage =
     "usage: hvpack make FOLDER OUT.hvpkg   make a package of a folder that holds a _hvmanifest.xml\n"
     "       hvpack check FILE...           check packages as the installer does\n"
-    "       hvpack list FILE               list what a package holds, folders first\n";
+    "       hvpack list FILE               list what a package holds, folders first\n"
+    "       hvpack table FOLDER [OUT.cpp]  write the validation table of a release, a C++ source\n";
 
 using Arguments = std::vector<std::string>;
 
@@ -70,13 +73,7 @@ bool Make(const Arguments& arguments, std::ostream& out, std::ostream& err) {
 }
 
 bool CheckOne(const std::string& file, std::ostream& out) {
-    HV::Package package{fs::path(file)};
-    if (package.zipPath.empty()) {
-        throw PackageError(file + " is not named .hvpkg or .zip");
-    }
-    if (!package.Validate(false)) {
-        throw PackageError(file + " is not a sound package");
-    }
+    (void)SoundPackage(file);
     out << "OK " << file << '\n';
     return true;
 }
@@ -104,6 +101,40 @@ bool List(const Arguments& arguments, std::ostream& out, std::ostream& err) {
     return true;
 }
 
+/// Rows for all packages that are sound, and whether that is every one of them.
+bool ReadRelease(const fs::path& folder, std::vector<ReleaseRow>& rows, std::ostream& err) {
+    bool sound = true;
+    for (const fs::path& package : PackagesIn(folder)) {
+        sound &= Report(err, [&] {
+            rows.push_back(RowOf(package));
+            return true;
+        });
+    }
+    return sound;
+}
+
+void PrintSource(const std::string& source, std::ostream& out) {
+    if (!(out << source << std::flush)) {
+        throw PackageError("cannot write the table");
+    }
+}
+
+bool Table(const Arguments& arguments, std::ostream& out, std::ostream& err) {
+    return Report(err, [&] {
+        std::vector<ReleaseRow> rows;
+        if (!ReadRelease(fs::path(arguments[1]), rows, err)) {
+            return false;
+        }
+        if (arguments.size() == 2) {
+            PrintSource(TableSource(rows), out);
+        } else {
+            WriteSource(fs::path(arguments[2]), TableSource(rows));
+            out << "OK " << arguments[2] << '\n';
+        }
+        return true;
+    });
+}
+
 }  // namespace
 
 int RunCommand(const Arguments& arguments, std::ostream& out, std::ostream& err) {
@@ -117,6 +148,9 @@ int RunCommand(const Arguments& arguments, std::ostream& out, std::ostream& err)
     }
     if (command == "list" && arguments.size() == 2) {
         return List(arguments, out, err) ? 0 : 1;
+    }
+    if (command == "table" && (arguments.size() == 2 || arguments.size() == 3)) {
+        return Table(arguments, out, err) ? 0 : 1;
     }
     err << kUsage;
     return 1;

@@ -6,7 +6,7 @@
 
 namespace HVPack {
 
-/// The program hvpack without its process: makes, checks and lists packages.
+/// The program hvpack without its process: makes, checks and lists packages, and writes the table of a release.
 ///
 /// `arguments` are those behind the program's name. Results go to `out`, one line each; everything that went wrong, the
 /// engine's own lines included, goes to `err`. Returns the exit status: 0, or 1 when anything went wrong or the

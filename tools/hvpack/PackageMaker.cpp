@@ -10,6 +10,8 @@
 #include "package/Package.h"
 #include "package/ZipEntries.h"
 #include "platform/libraries.h"
+#include "tools/hvpack/PackageError.h"
+#include "tools/hvpack/SoundPackage.h"
 #include "tools/hvpack/WideCount.h"
 
 namespace HVPack {
@@ -167,8 +169,7 @@ private:
 };
 
 void RefuseUnlessNamedAsPackage(const fs::path& output) {
-    const std::string extension = output.extension().string();
-    if (extension != ".hvpkg" && extension != ".zip") {
+    if (!IsNamedAsPackage(output)) {
         throw PackageError("a package is named .hvpkg or .zip, not " + output.filename().string());
     }
 }

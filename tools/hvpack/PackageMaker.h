@@ -1,17 +1,8 @@
 #pragma once
 
-#include <stdexcept>
-#include <string>
-
 #include "platform/filesystem.h"
 
 namespace HVPack {
-
-/// Why a package could not be made, as a line for the person who asked for it.
-class PackageError : public std::runtime_error {
-public:
-    using std::runtime_error::runtime_error;
-};
 
 /// Makes a package of all that is in `folder`, and puts it at `output` when the engine's own check has found it sound.
 ///

@@ -1,0 +1,23 @@
+#include "tools/hvpack/SoundPackage.h"
+
+#include "tools/hvpack/PackageError.h"
+
+namespace HVPack {
+
+bool IsNamedAsPackage(const fs::path& file) {
+    const std::string extension = file.extension().string();
+    return extension == ".hvpkg" || extension == ".zip";
+}
+
+HV::Package SoundPackage(const std::string& file) {
+    HV::Package package{fs::path(file)};
+    if (package.zipPath.empty()) {
+        throw PackageError(file + " is not named .hvpkg or .zip");
+    }
+    if (!package.Validate(false)) {
+        throw PackageError(file + " is not a sound package");
+    }
+    return package;
+}
+
+}  // namespace HVPack

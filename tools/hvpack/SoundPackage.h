@@ -1,0 +1,16 @@
+#pragma once
+
+#include <string>
+
+#include "package/Package.h"
+
+namespace HVPack {
+
+/// Whether a file is named as packages are, ".hvpkg" or ".zip", in lower case.
+[[nodiscard]] bool IsNamedAsPackage(const fs::path& file);
+
+/// The package in `file`, found sound by the engine's own check. Throws PackageError, or the std::runtime_error of the
+/// package for a file that is not there; the engine's reasons are in the log.
+[[nodiscard]] HV::Package SoundPackage(const std::string& file);
+
+}  // namespace HVPack
