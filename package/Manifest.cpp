@@ -3,16 +3,13 @@
 #include <utility>
 
 #include "hvframework/Log.h"
-#include "package/XmlNesting.h"
+#include "hvframework/XmlNesting.h"
 #include "package/XmlReaders.h"
 
 namespace HV {
 namespace {
 
 using Elements = std::vector<const TiXmlElement*>;
-
-/// A manifest nests six deep. Beyond some thousands the XML library runs out of stack.
-constexpr std::size_t kDeepestElement = 200;
 
 bool ReadRequired(const TiXmlElement& root, const char* name, std::string& out, const char* meaning) {
     if (GetAttribute(root, name, out)) {
@@ -99,9 +96,9 @@ bool ReadPayloads(const TiXmlElement& root, std::vector<Payload>& payloads) {
 /// The library trusts its input in two ways that a package from outside must not be trusted in: it steps over the end
 /// of a text that stops within a character, hence the zeros behind it, and it goes as deep as elements are nested.
 bool ParseTree(const std::string& text, TiXmlDocument& document) {
-    const std::string padded = text + std::string(kXmlPadding, '\0');
-    if (DeepestNesting(padded) > kDeepestElement) {
-        HVL_LOG(Error, "XML parsing failed: elements are nested more than " << kDeepestElement << " deep");
+    const std::string padded = text + std::string(HVL::kXmlPadding, '\0');
+    if (HVL::DeepestNesting(padded) > HVL::kDeepestElement) {
+        HVL_LOG(Error, "XML parsing failed: elements are nested more than " << HVL::kDeepestElement << " deep");
         return false;
     }
     document.Parse(padded.c_str(), nullptr, TIXML_ENCODING_UNKNOWN);

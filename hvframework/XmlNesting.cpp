@@ -1,9 +1,9 @@
-#include "package/XmlNesting.h"
+#include "hvframework/XmlNesting.h"
 
 #include <algorithm>
 #include <cstring>
 
-namespace HV {
+namespace HVL {
 namespace {
 
 /// How the library tells characters apart. Before a declaration it takes bytes, but does not know yet what follows.
@@ -235,4 +235,4 @@ std::size_t DeepestNesting(const std::string& text) {
     return NestingScan(text.c_str(), marked ? Reading::Utf8 : Reading::Undecided).Deepest();
 }
 
-}  // namespace HV
+}  // namespace HVL

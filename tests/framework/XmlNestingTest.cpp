@@ -1,4 +1,4 @@
-#include "package/XmlNesting.h"
+#include "hvframework/XmlNesting.h"
 
 #include <gtest/gtest.h>
 #include <tinyxml.h>
@@ -11,11 +11,11 @@
 namespace {
 
 std::string Padded(std::string_view text) {
-    return std::string(text) + std::string(HV::kXmlPadding, '\0');
+    return std::string(text) + std::string(HVL::kXmlPadding, '\0');
 }
 
 std::size_t Scanned(std::string_view text) {
-    return HV::DeepestNesting(Padded(text));
+    return HVL::DeepestNesting(Padded(text));
 }
 
 std::size_t DepthBelow(const TiXmlNode& node) {
