@@ -42,10 +42,13 @@ TEST_F(Status, TellsFilesFromDirectories) {
 
 TEST_F(Status, FindsNothingWhereNothingIs) {
     machine.Has(R"(C:\T\a.txt)", "x");
+    int paths = 0;
     for (const char* path : {R"(C:\T\b)", R"(C:\None\b)", R"(C:\T\a.txt\b)", ""}) {
         EXPECT_FALSE(FileExists(path)) << path;
         EXPECT_FALSE(DirectoryExists(path)) << path;
+        ++paths;
     }
+    EXPECT_EQ(paths, 4);
 }
 
 TEST_F(Status, TakesForwardSlashesToo) {

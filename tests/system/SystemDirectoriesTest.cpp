@@ -49,9 +49,12 @@ TEST_F(SystemDirectories, AreEmptyForValuesThatNameNone) {
 }
 
 TEST_F(SystemDirectories, AreFixedForSomeKeywords) {
+    int variables = 0;
     for (const char* variable : {"ProgramData", "PROGRAMFILES", "Public", "SystemRoot", "CommonProgramFiles"}) {
         SetEnvironmentVariableA(variable, R"(D:\Elsewhere)");
+        ++variables;
     }
+    EXPECT_EQ(variables, 5);
     EXPECT_EQ(DirectoryOf("commondocs"), R"(C:\Users\Public\Documents)");
     EXPECT_EQ(DirectoryOf("ofx"), R"(C:\Program Files\Common Files\OFX\Plugins)");
     EXPECT_EQ(DirectoryOf("history"), R"(C:\ProgramData\Halvorn\.hvdeploy\history)");
@@ -68,9 +71,12 @@ TEST_F(SystemDirectories, AreMacPathsForMacKeywords) {
 }
 
 TEST_F(SystemDirectories, FollowTheEnvironmentAtEachCall) {
+    int places = 0;
+    int variables = 0;
     for (const std::string place : {R"(D:\One)", R"(D:\Two)"}) {
         for (const char* variable : {"LOCALAPPDATA", "Temp", "USERPROFILE", "ProgramData", "AppData"}) {
             SetEnvironmentVariableA(variable, place.c_str());
+            ++variables;
         }
         EXPECT_EQ(DirectoryOf("localappdata"), place);
         EXPECT_EQ(DirectoryOf("temp"), place);
@@ -78,7 +84,10 @@ TEST_F(SystemDirectories, FollowTheEnvironmentAtEachCall) {
         EXPECT_EQ(DirectoryOf("userappsupport"), place + R"(\Library\Application Support)");
         EXPECT_EQ(DirectoryOf("logs"), place + R"(\Halvorn\logs)");
         EXPECT_EQ(DirectoryOf("userlogs"), place + R"(\Halvorn\logs)");
+        ++places;
     }
+    EXPECT_EQ(places, 2);
+    EXPECT_EQ(variables, 10);
 }
 
 TEST_F(SystemDirectories, PutNoSecondSeparatorBehindAVariableThatEndsInOne) {
@@ -87,9 +96,12 @@ TEST_F(SystemDirectories, PutNoSecondSeparatorBehindAVariableThatEndsInOne) {
 }
 
 TEST_F(SystemDirectories, HaveNoFallbackForVariablesThatAreNotSet) {
+    int variables = 0;
     for (const char* variable : {"LOCALAPPDATA", "Temp", "USERPROFILE", "ProgramData", "AppData"}) {
         SetEnvironmentVariableA(variable, nullptr);
+        ++variables;
     }
+    EXPECT_EQ(variables, 5);
     EXPECT_EQ(DirectoryOf("localappdata"), "");
     EXPECT_EQ(DirectoryOf("temp"), "");
     EXPECT_EQ(DirectoryOf("userappsupport"), R"(\Library\Application Support)");
