@@ -1,12 +1,15 @@
 #include "bench/Measure.h"
 
 #include <algorithm>
+#include <chrono>
 #include <cstddef>
+#include <cstdlib>
 #include <fstream>
 #include <stdexcept>
 
 #include "bench/Process.h"
 #include "bench/SuiteMaker.h"
+#include "hvdeploy/src/UninstallScripts.h"
 
 namespace HVBench {
 namespace {
@@ -133,6 +136,48 @@ std::vector<Figure> TakePackages(const Place& place) {
     return {{"a package of 1,000 against one of 10, rolled back: time", ratio, 1.3}};
 }
 
+// --- The script for removal
+
+/// Writes a script that lists this many files, and then the same package again, as a repair does: each of its files is
+/// looked for among the lines that are there. Gives the seconds that both took.
+double WriteRemovalScript(int files) {
+    static int number = 0;
+    std::vector<std::string> paths;
+    for (int i = 0; i < files; ++i) {
+        paths.push_back("C:\\Program Files\\Halvorn\\Tessaly\\Presets\\Preset " + std::to_string(i) + ".ffx");
+    }
+    std::string script = "C:\\Bench\\removal-" + std::to_string(++number) + ".bat";
+    HVL::ProductData product;
+    product.SetValue("display_name", "Bench Suite");
+    product.SetValue("version", "1.0.0");
+    const HV::Package package{fs::path("bench")};
+    const auto start = std::chrono::steady_clock::now();
+    // A run of its own for each: what stands in the script is read from the disk again.
+    (void)HV::UninstallScripts().WriteStandaloneUninstallScript(script, paths, package, product, "");
+    (void)HV::UninstallScripts().WriteStandaloneUninstallScript(script, paths, package, product, "");
+    const std::chrono::duration<double> taken = std::chrono::steady_clock::now() - start;
+    std::ifstream written(std::string(std::getenv("HV_MACHINE")) + "/drive_c/Bench/removal-" + std::to_string(number) +
+                          ".bat");
+    int deletes = 0;
+    for (std::string line; std::getline(written, line);) {
+        deletes += line.starts_with("CALL DEL") ? 1 : 0;
+    }
+    if (deletes != files) {
+        throw std::runtime_error("the script deletes " + std::to_string(deletes) + " files of " +
+                                 std::to_string(files));
+    }
+    return taken.count();
+}
+
+std::vector<Figure> TakeRemoval(const Place& place) {
+    constexpr int kMany = 20000;
+    constexpr int kFew = 2000;
+    setenv("HV_MACHINE", Fresh(place).c_str(), 1);
+    const double ratio = CostRatio(kMany, kFew, WriteRemovalScript);
+    // Looking through all lines for each file would give 10. What is above 1 is memory: a long list leaves the caches.
+    return {{"a file in a removal script of 20,000 against 2,000: time", ratio, 3}};
+}
+
 // --- The digest
 
 constexpr int kDigestPairs = 9;
@@ -154,8 +199,11 @@ std::vector<Figure> TakeMd5(const Place& place) {
 }  // namespace
 
 const std::vector<Measurement>& Measurements() {
-    static const std::vector<Measurement> all = {
-        {"install", TakeInstall}, {"files", TakeFiles}, {"packages", TakePackages}, {"md5", TakeMd5}};
+    static const std::vector<Measurement> all = {{"install", TakeInstall},
+                                                 {"files", TakeFiles},
+                                                 {"packages", TakePackages},
+                                                 {"removal", TakeRemoval},
+                                                 {"md5", TakeMd5}};
     return all;
 }
 

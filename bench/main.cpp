@@ -45,7 +45,7 @@ int main(int count, char** texts) {
         return 0;
     }
     if (count < 3) {
-        std::fputs("usage: hvbench PROGRAMS WORK [install] [files] [packages] [md5]\n", stderr);
+        std::fputs("usage: hvbench PROGRAMS WORK [install] [files] [packages] [removal] [md5]\n", stderr);
         return 1;
     }
     const std::vector<std::string> wanted(arguments.begin() + 3, arguments.end());
@@ -53,7 +53,7 @@ int main(int count, char** texts) {
         return std::ranges::any_of(HVBench::Measurements(), [&](const auto& item) { return item.name == name; });
     };
     if (!std::ranges::all_of(wanted, isKnown)) {
-        std::fputs("hvbench: there are the measurements install, files, packages and md5\n", stderr);
+        std::fputs("hvbench: there are the measurements install, files, packages, removal and md5\n", stderr);
         return 1;
     }
     bool holds = true;
