@@ -9,9 +9,6 @@
 #include "tests/support/Machine.h"
 #include "tests/support/RunningProgram.h"
 
-// Behind the system's main header, which it needs.
-#include <psapi.h>
-
 struct RunningProgram::Process {
     HANDLE handle = nullptr;
 };
