@@ -25,6 +25,12 @@ if(HV_SANITIZE)
     add_link_options(-fsanitize=${HV_SANITIZE})
 endif()
 
+# What ships is stripped and says nothing of the time at which it was made; it may be loaded anywhere, and its data are
+# not run.
+if(WIN32)
+    add_link_options(-s -Wl,--no-insert-timestamp,--dynamicbase,--high-entropy-va,--nxcompat)
+endif()
+
 add_library(hv_flags INTERFACE)
 target_include_directories(hv_flags INTERFACE ${CMAKE_SOURCE_DIR})
 target_compile_options(hv_flags INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
