@@ -1,6 +1,8 @@
 // How the wizard comes up: the window first, then what speaks against a run.
 #include "installer/WinWizardController.h"
 
+#include <cstdlib>
+
 #include "installer/InstallerModel.h"
 #include "installer/WizardBoxes.h"
 
@@ -51,6 +53,7 @@ void WinWizardController::EndWith(InstallerWindow* owner, const std::string& tit
     toolkit_.MessageBeep(kStopBox);
     toolkit_.MessageBoxA(owner, text, title, kStopBox);
     toolkit_.ExitProcess(0);
+    std::abort();  // not reached: the compiler forgets of a virtual operation that it does not return
 }
 
 }  // namespace HV
