@@ -1,0 +1,45 @@
+#pragma once
+
+/// The arithmetic of the wizard's windows, in pixels: where things stand and how far they reach. No window in sight.
+namespace HV {
+
+/// A stretch of columns; `right` is the first column behind it.
+struct Columns {
+    int left = 0;
+    int right = 0;
+};
+
+/// A rectangle; `right` and `bottom` lie outside it.
+struct Place {
+    int left = 0;
+    int top = 0;
+    int right = 0;
+    int bottom = 0;
+};
+
+/// One step of a window's widening.
+struct Growth {
+    Columns columns;        // where the window stands after the step
+    bool finished = false;  // it has its width, and no step follows
+};
+
+/// Widens a window by 25 columns on each side. A step that reaches or passes `width` ends at exactly that width.
+[[nodiscard]] Growth Grow(Columns window, int width);
+
+/// How many columns of a bar `percent` fills. Below 0 is as 0, above 100 is as 100; parts of a column do not count.
+[[nodiscard]] int FillWidth(int percent, int barWidth);
+
+/// How many products the selection page has room for: two columns of six. Nothing scrolls.
+constexpr int kCheckBoxes = 12;
+
+/// Where the check box of the product `index`, from 0 on, stands on a page with these columns. Below the first six in
+/// the left column, the next six in the right one; `firstRow` is the top of both.
+[[nodiscard]] Place CheckBoxPlace(int index, Columns page, int firstRow);
+
+/// The left edge of a check box's label.
+[[nodiscard]] int CheckBoxLabelLeft(const Place& box);
+
+/// The diameter of the corners of a rounded rectangle.
+[[nodiscard]] int CornerDiameter(int width, int height);
+
+}  // namespace HV

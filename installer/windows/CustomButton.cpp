@@ -1,0 +1,129 @@
+#include "installer/windows/CustomButton.h"
+
+#include <cstdint>
+
+#include "installer/WizardArithmetic.h"
+#include "installer/windows/Painting.h"
+#include "installer/windows/WizardMetrics.h"
+#include "platform/utf8.h"
+
+namespace HV {
+
+namespace {
+
+// Neither colour nor opacity: the outline is drawn and does not show. A colour here would put a frame around every
+// button of the wizard.
+constexpr Gdiplus::ARGB kInvisible = 0x00FFFFFF;
+constexpr float kPenWidth = 1.0F;
+constexpr int kTextInset = 3;
+constexpr unsigned kCentred = DT_CENTER | DT_VCENTER | DT_SINGLELINE;
+
+Gdiplus::Rect RectOf(const RECT& place) {
+    return {static_cast<INT>(place.left), static_cast<INT>(place.top), static_cast<INT>(place.right - place.left),
+            static_cast<INT>(place.bottom - place.top)};
+}
+
+void FillBackground(Gdiplus::Graphics& graphics, CustomButtonOwner* owner, const Gdiplus::Rect& place) {
+    const Gdiplus::Brush* const background = owner == nullptr ? nullptr : owner->BackgroundBrush();
+    if (background != nullptr) {
+        graphics.FillRectangle(background, place);
+        return;
+    }
+    const Gdiplus::SolidBrush black(Gdiplus::Color(OpaqueOf(0x000000)));
+    graphics.FillRectangle(&black, place);
+}
+
+// A disabled button is grey whether it is highlighted or not.
+unsigned FaceOf(const CustomButton& button, bool enabled) {
+    if (!enabled) {
+        return WizardMetrics::DisabledFaceColor;
+    }
+    return button.highlighted ? WizardMetrics::HighlightColor : WizardMetrics::FaceColor;
+}
+
+}  // namespace
+
+void CustomButton::SetText(const std::string& newText) {
+    if (newText == text) {
+        return;
+    }
+    text = newText;
+    if (handle != nullptr) {
+        // What the control itself is called is not painted, and is what screen readers say.
+        ::SetWindowTextW(handle, platform::WideFromUtf8(text).c_str());
+        ::InvalidateRect(handle, nullptr, TRUE);
+    }
+}
+
+void CustomButton::SetHighlighted(bool newHighlighted) {
+    if (newHighlighted == highlighted) {
+        return;
+    }
+    highlighted = newHighlighted;
+    if (handle != nullptr) {
+        ::InvalidateRect(handle, nullptr, TRUE);
+    }
+}
+
+void MakeButton(CustomButton& button, HWND parent, const std::string& text, int identifier, const RECT& place,
+                DWORD style) {
+    button.text = text;
+    button.handle = MakeButtonControl(parent, platform::WideFromUtf8(text).c_str(), identifier, place, style);
+}
+
+HWND MakeButtonControl(HWND parent, const wchar_t* text, int identifier, const RECT& place, DWORD style) {
+    // NOLINTNEXTLINE(performance-no-int-to-ptr): where a menu would be, a control has its identifier.
+    const auto menu = reinterpret_cast<HMENU>(static_cast<std::intptr_t>(identifier));
+    return ::CreateWindowExW(0, L"BUTTON", text, style, place.left, place.top, place.right - place.left,
+                             place.bottom - place.top, parent, menu, ::GetModuleHandleW(nullptr), nullptr);
+}
+
+bool IsEnabled(const DRAWITEMSTRUCT& item) {
+    // The state as a whole: disabled and anything else besides is left to the second question.
+    return item.itemState != ODS_DISABLED && ::IsWindowEnabled(item.hwndItem) != FALSE;
+}
+
+void DrawButton(const CustomButton& button, const DRAWITEMSTRUCT& item) {
+    const bool enabled = IsEnabled(item);
+    const Gdiplus::Rect place = RectOf(item.rcItem);
+    {
+        Gdiplus::Graphics graphics(item.hDC);
+        FillBackground(graphics, button.owner, place);
+        graphics.SetSmoothingMode(Gdiplus::SmoothingModeHighQuality);
+        const Gdiplus::SolidBrush face(Gdiplus::Color(OpaqueOf(FaceOf(button, enabled))));
+        FillRoundedRect(graphics, face, place, kInvisible);
+    }
+    RECT inside = item.rcItem;
+    ::InflateRect(&inside, -kTextInset, -kTextInset);
+    ::SetBkMode(item.hDC, TRANSPARENT);
+    DrawColoredText(item.hDC, button.text, inside, WizardMetrics::Instance().BodyFont, kCentred,
+                    enabled ? WizardMetrics::TextColor : WizardMetrics::DisabledTextColor);
+}
+
+void FillRoundedRect(Gdiplus::Graphics& graphics, const Gdiplus::Brush& brush, const Gdiplus::Rect& place,
+                     Gdiplus::ARGB penColor) {
+    const Gdiplus::Unit unit = graphics.GetPageUnit();
+    graphics.SetPageUnit(Gdiplus::UnitPixel);
+    Gdiplus::Pen pen(Gdiplus::Color(penColor), kPenWidth);
+    pen.SetAlignment(Gdiplus::PenAlignmentCenter);
+    Gdiplus::GraphicsPath path;
+    AddRoundedRect(path, place.X, place.Y, place.Width, place.Height);
+    graphics.FillPath(&brush, &path);
+    graphics.DrawPath(&pen, &path);
+    graphics.SetPageUnit(unit);
+}
+
+void AddRoundedRect(Gdiplus::GraphicsPath& path, int x, int y, int width, int height) {
+    const int diameter = CornerDiameter(width, height);
+    // One pixel short, so that a strip of the background shows on the right and below.
+    const int right = x + width - diameter - 1;
+    const int bottom = y + height - diameter - 1;
+    path.Reset();
+    path.AddArc(x, y, diameter, diameter, 180, 90);
+    path.AddArc(right, y, diameter, diameter, 270, 90);
+    path.AddArc(right, bottom, diameter, diameter, 0, 90);
+    path.AddArc(x, bottom, diameter, diameter, 90, 90);
+    path.CloseFigure();
+}
+
+}  // namespace HV

@@ -1,0 +1,142 @@
+#include "installer/windows/EULAWindow.h"
+
+#include "installer/windows/EULAWindowController.h"
+#include "installer/windows/Painting.h"
+#include "installer/windows/WizardMetrics.h"
+
+namespace HV {
+
+namespace {
+
+constexpr int kIcon = 129;
+constexpr int kAgreement = 137;
+constexpr DWORD kStyle = 0x00C80000;  // caption and system menu: no resizing
+constexpr RECT kWindowRect{0, 0, 560, 640};
+constexpr int kCloseControl = 161;
+constexpr int kSaveControl = 1184;
+constexpr LONG kButtonBottom = 590;
+constexpr LONG kButtonTop = kButtonBottom - WizardMetrics::ButtonHeight;
+constexpr DWORD kRichTextStyle = 0x50A10844;
+constexpr RECT kRichTextRect{30, 50, 510, 545};
+constexpr LONG kInset = 10;
+
+}  // namespace
+
+std::string LoadAgreementText() {
+    const HRSRC found = ::FindResourceA(nullptr, MAKEINTRESOURCEA(kAgreement), "RICHTEXTFORMAT");
+    const HGLOBAL loaded = found == nullptr ? nullptr : ::LoadResource(nullptr, found);
+    const auto* const bytes = loaded == nullptr ? nullptr : static_cast<const char*>(::LockResource(loaded));
+    // It does not end in a zero: its size is the only end that it has.
+    std::string text = bytes == nullptr ? std::string() : std::string(bytes, ::SizeofResource(nullptr, found));
+    if (loaded != nullptr) {
+        ::FreeResource(loaded);
+    }
+    return text.empty() ? "ERROR: license agreement data failed to load from resource." : text;
+}
+
+EULAWindow::EULAWindow(EULAWindowController& controller) : controller_(controller) {}
+
+ATL::CWndClassInfo& EULAWindow::GetWndClassInfo() {
+    static ATL::CWndClassInfo info{kIcon};
+    return info;
+}
+
+bool EULAWindow::CreateCentered() {
+    if (Create(nullptr, kWindowRect, "Halvorn Software License", kStyle) == nullptr) {
+        return false;
+    }
+    CenterWindow();
+    return true;
+}
+
+BOOL EULAWindow::ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) {
+    switch (message) {
+        case WM_CREATE:
+            OnCreate();
+            return TRUE;
+        case WM_ERASEBKGND:
+            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry handles as numbers.
+            FillClient(window, reinterpret_cast<HDC>(wParam), WizardMetrics::Instance().LightBrush);
+            result = TRUE;
+            return TRUE;
+        case WM_PAINT: {
+            const PaintDevice nothing(window);
+            return TRUE;
+        }
+        case WM_CLOSE:
+            ::DestroyWindow(window);
+            return TRUE;
+        case WM_DRAWITEM:
+            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry pointers as numbers.
+            result = OnDrawItem(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam)) ? TRUE : FALSE;
+            return result != FALSE;
+        case WM_COMMAND:
+            OnCommand(wParam);
+            return TRUE;
+        default:
+            return FALSE;
+    }
+}
+
+void EULAWindow::OnFinalMessage(HWND) {
+    controller_.Forget(*this);
+    delete this;
+}
+
+void EULAWindow::OnCreate() {
+    MakeButton(closeButton_, m_hWnd, "Close", kCloseControl, {350, kButtonTop, 430, kButtonBottom});
+    saveButton_.highlighted = true;
+    MakeButton(saveButton_, m_hWnd, "Save License", kSaveControl, {440, kButtonTop, 520, kButtonBottom});
+    richText_ = ::CreateWindowExW(0, L"RICHEDIT50W", L"License", kRichTextStyle, kRichTextRect.left, kRichTextRect.top,
+                                  kRichTextRect.right - kRichTextRect.left, kRichTextRect.bottom - kRichTextRect.top,
+                                  m_hWnd, nullptr, ::GetModuleHandleW(nullptr), nullptr);
+    agreementText_ = LoadAgreementText();
+    InsetText();
+    ShowText();
+}
+
+void EULAWindow::InsetText() const {
+    RECT text{};
+    ::SendMessageW(richText_, EM_GETRECT, 0, reinterpret_cast<LPARAM>(&text));
+    text.left += kInset;
+    text.top += kInset;
+    text.right -= kInset;
+    // The bottom stays: text that is scrolled runs down to the edge.
+    ::SendMessageW(richText_, EM_SETRECT, 0, reinterpret_cast<LPARAM>(&text));
+}
+
+void EULAWindow::ShowText() const {
+    SETTEXTEX as{};
+    as.flags = ST_DEFAULT;
+    as.codepage = CP_ACP;
+    ::SendMessageA(richText_, EM_SETTEXTEX, reinterpret_cast<WPARAM>(&as),
+                   reinterpret_cast<LPARAM>(agreementText_.c_str()));
+}
+
+bool EULAWindow::OnDrawItem(const DRAWITEMSTRUCT& item) const {
+    if (item.CtlID != kCloseControl && item.CtlID != kSaveControl) {
+        return false;
+    }
+    DrawButton(item.CtlID == kCloseControl ? closeButton_ : saveButton_, item);
+    return true;
+}
+
+void EULAWindow::OnCommand(WPARAM command) {
+    if (!IsPress(command)) {
+        // The text has notifications of its own.
+        return;
+    }
+    switch (LOWORD(command)) {
+        case kCloseControl:
+        case IDCANCEL:  // the Escape key
+            ::DestroyWindow(m_hWnd);
+            return;
+        case kSaveControl:
+            controller_.SaveAgreement(agreementText_, *this);
+            return;
+        default:
+            return;
+    }
+}
+
+}  // namespace HV

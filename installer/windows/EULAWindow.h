@@ -1,0 +1,47 @@
+#pragma once
+
+#include <string>
+
+#include "installer/windows/CustomButton.h"
+#include "platform/windows/atl.h"
+
+namespace HV {
+
+class EULAWindowController;
+
+/// A viewer of the licence agreement: a window of its own, beside the wizard and independent of it.
+///
+/// Made with new; it deletes itself when the user has closed it.
+class EULAWindow : public ATL::CWindowImpl<EULAWindow> {
+public:
+    /// `controller` is not owned and must outlive the window. Its text is the one that this program carries.
+    explicit EULAWindow(EULAWindowController& controller);
+
+    /// Makes the window, hidden and centred on its monitor. Returns whether it is there.
+    [[nodiscard]] bool CreateCentered();
+
+    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
+    ~EULAWindow() override = default;
+    void OnFinalMessage(HWND window) override;
+
+    static ATL::CWndClassInfo& GetWndClassInfo();
+
+private:
+    void OnCreate();
+    void InsetText() const;
+    void ShowText() const;
+    [[nodiscard]] bool OnDrawItem(const DRAWITEMSTRUCT& item) const;
+    void OnCommand(WPARAM command);
+
+    // Without an owner on purpose: the corners of these buttons are black.
+    CustomButton closeButton_;
+    CustomButton saveButton_;
+    HWND richText_ = nullptr;
+    EULAWindowController& controller_;
+    std::string agreementText_;  // as the program carries it
+};
+
+/// The agreement that this program carries, as raw rich text; a line that says so when it cannot be had.
+[[nodiscard]] std::string LoadAgreementText();
+
+}  // namespace HV

@@ -1,0 +1,44 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "platform/windows/atl.h"
+
+namespace HV {
+
+class WinWizardController;
+
+/// The page of a running install: a title, a bar and a line of status.
+class InstallingPage : public ATL::CWindowImpl<InstallingPage> {
+public:
+    /// `controller` is not owned.
+    InstallingPage(WinWizardController& controller, std::string status, std::int32_t percent);
+
+    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
+    ~InstallingPage() override = default;
+
+    static ATL::CWndClassInfo& GetWndClassInfo();
+
+    /// Each setting has the part of the page painted that shows it, and no other. A percent of -1 is an empty bar.
+    void SetPercent(std::int32_t percent);
+    void SetStatusText(const std::string& text);
+
+    [[nodiscard]] std::int32_t Percent() const { return percent_; }
+    [[nodiscard]] const std::string& StatusText() const { return status_; }
+
+private:
+    void OnCreate();
+    void OnPaint();
+    void PaintBar(HDC device);
+
+    RECT titleRect_{};
+    RECT statusRect_{};
+    RECT barRect_{};
+    std::int32_t percent_;
+    std::string title_;
+    std::string status_;
+    WinWizardController& controller_;
+};
+
+}  // namespace HV

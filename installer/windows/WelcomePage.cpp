@@ -1,0 +1,125 @@
+#include "installer/windows/WelcomePage.h"
+
+#include "installer/InstallerModel.h"
+#include "installer/WinWizardController.h"
+#include "installer/windows/Painting.h"
+#include "installer/windows/WizardMetrics.h"
+
+namespace HV {
+
+namespace {
+
+constexpr int kBelowButtons = 12;
+constexpr int kWidth = 70;  // of Agree and Disagree
+
+}  // namespace
+
+WelcomePage::WelcomePage(WinWizardController& controller)
+    : brush_(Gdiplus::Color(OpaqueOf(WizardMetrics::PageColor))), controller_(controller) {}
+
+ATL::CWndClassInfo& WelcomePage::GetWndClassInfo() {
+    static ATL::CWndClassInfo info;
+    return info;
+}
+
+BOOL WelcomePage::ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) {
+    switch (message) {
+        case WM_CREATE:
+            OnCreate();
+            return TRUE;
+        case WM_ERASEBKGND:
+            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry handles as numbers.
+            FillClient(window, reinterpret_cast<HDC>(wParam), WizardMetrics::Instance().PageBrush);
+            result = TRUE;
+            return TRUE;
+        case WM_PAINT:
+            OnPaint();
+            return TRUE;
+        case WM_DRAWITEM:
+            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry pointers as numbers.
+            result = OnDrawItem(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam)) ? TRUE : FALSE;
+            return result != FALSE;
+        case WM_COMMAND:
+            OnCommand(wParam);
+            return TRUE;
+        default:
+            return FALSE;
+    }
+}
+
+void WelcomePage::OnCreate() {
+    LoadTexts();
+    MakeButtons();
+    SendMessageToDescendants(WM_SETFONT, reinterpret_cast<WPARAM>(WizardMetrics::Instance().BodyFont), FALSE);
+}
+
+void WelcomePage::LoadTexts() {
+    const InstallerModel& model = InstallerModel::Instance();
+    paragraph = model.GetString("installer.welcome.p-1");
+    requirementsHeading = "System Requirements";
+    requirements = model.GetString("installer.welcome.sysreq");
+    // A bare return breaks the line where these lines are drawn; the blank before it belongs to the text.
+    agreementNotice = "To continue with the install you must agree \rto the terms of the software license agreement.";
+    agreementChoice = "Click Agree to continue or Disagree to cancel \rand quit the installation.";
+}
+
+void WelcomePage::MakeButtons() {
+    const RECT client = GetClientRect();
+    const LONG bottom = client.bottom - kBelowButtons;
+    const LONG top = bottom - WizardMetrics::ButtonHeight;
+    const LONG agreeRight = client.right - 20;
+    const RECT agree{agreeRight - kWidth, top, agreeRight, bottom};
+    const LONG disagreeRight = agree.left - 10;
+    const RECT disagree{disagreeRight - kWidth, top, disagreeRight, bottom};
+    MakeButton(readLicenseButton, m_hWnd, "Read License...", kReadLicenseCommand,
+               {client.left, top, client.left + 100, bottom});
+    MakeButton(disagreeButton, m_hWnd, "Disagree", kDisagreeCommand, disagree);
+    MakeButton(agreeButton, m_hWnd, "Agree", kAgreeCommand, agree);
+    for (CustomButton* button : {&readLicenseButton, &disagreeButton, &agreeButton}) {
+        button->owner = this;
+    }
+}
+
+void WelcomePage::OnPaint() const {
+    const WizardMetrics& metrics = WizardMetrics::Instance();
+    const PaintDevice device(m_hWnd);
+    const RECT client = GetClientRect();
+    const auto draw = [&](const std::string& text, LONG top, LONG bottom, HFONT font) {
+        DrawPageText(device, text, {client.left, top, client.right, bottom}, font, DT_WORDBREAK);
+    };
+    draw(paragraph, 20, 65, metrics.BodyFont);
+    draw(requirementsHeading, 85, 100, metrics.StrongFont);
+    draw(requirements, 100, 150, metrics.BodyFont);
+    draw(agreementNotice, 170, 200, metrics.StrongFont);
+    draw(agreementChoice, 215, 245, metrics.BodyFont);
+}
+
+const CustomButton* WelcomePage::ButtonForId(int identifier) const {
+    switch (identifier) {
+        case kReadLicenseCommand:
+            return &readLicenseButton;
+        case kAgreeCommand:
+            return &agreeButton;
+        case kDisagreeCommand:
+            return &disagreeButton;
+        default:
+            return nullptr;
+    }
+}
+
+bool WelcomePage::OnDrawItem(const DRAWITEMSTRUCT& item) const {
+    const CustomButton* const button = ButtonForId(static_cast<int>(item.CtlID));
+    if (button != nullptr) {
+        DrawButton(*button, item);
+    }
+    return button != nullptr;
+}
+
+void WelcomePage::OnCommand(WPARAM command) {
+    const int identifier = LOWORD(command);
+    if (IsPress(command) && ButtonForId(identifier) != nullptr) {
+        controller_.Perform(identifier);
+    }
+}
+
+}  // namespace HV

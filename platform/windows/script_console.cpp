@@ -1,0 +1,122 @@
+#include "platform/windows/script_console.h"
+
+#include <array>
+#include <cstdint>
+#include <string>
+
+namespace platform {
+
+namespace {
+
+constexpr int kTries = 500;
+constexpr DWORD kBetweenTries = 10;  // milliseconds
+
+bool LeadsSomewhere(FILE* stream) {
+    const int descriptor = _fileno(stream);
+    return descriptor >= 0 && _get_osfhandle(descriptor) != -1;
+}
+
+void OpenUnlessItLeadsSomewhere(FILE* stream, const char* mode, DWORD standard) {
+    if (LeadsSomewhere(stream) || std::freopen("NUL", mode, stream) == nullptr) {
+        return;
+    }
+    // The runtime does this by itself for console programs alone, and not every reader asks the runtime.
+    // NOLINTNEXTLINE(performance-no-int-to-ptr): the runtime gives handles as numbers.
+    ::SetStdHandle(standard, reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream))));
+}
+
+// The command processor of the system, and no other that a search path might lead to: this program runs with high
+// rights.
+std::wstring CommandProcessor() {
+    std::array<wchar_t, MAX_PATH> folder{};
+    const UINT length = ::GetSystemDirectoryW(folder.data(), static_cast<UINT>(folder.size()));
+    return std::wstring(folder.data(), length) + L"\\cmd.exe";
+}
+
+HANDLE NullDevice(SECURITY_ATTRIBUTES& security) {
+    return ::CreateFileW(L"NUL", GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_WRITE, &security, OPEN_EXISTING, 0,
+                         nullptr);
+}
+
+bool HasConsole() {
+    return ::GetConsoleCP() != 0;
+}
+
+void Close(HANDLE& handle) {
+    if (handle != nullptr && handle != INVALID_HANDLE_VALUE) {
+        ::CloseHandle(handle);
+    }
+    handle = nullptr;
+}
+
+}  // namespace
+
+void OpenMissingStandardStreams() {
+    // In the order of their numbers: each takes the lowest number that is free.
+    OpenUnlessItLeadsSomewhere(stdin, "r", STD_INPUT_HANDLE);
+    OpenUnlessItLeadsSomewhere(stdout, "w", STD_OUTPUT_HANDLE);
+    OpenUnlessItLeadsSomewhere(stderr, "w", STD_ERROR_HANDLE);
+}
+
+WindowlessConsole::WindowlessConsole() {
+    if (!HasConsole()) {
+        StartBearer();
+    }
+}
+
+WindowlessConsole::~WindowlessConsole() {
+    Close(input_);
+    Close(bearer_);
+}
+
+void WindowlessConsole::StartBearer() {
+    SECURITY_ATTRIBUTES inherited{sizeof inherited, nullptr, TRUE};
+    HANDLE itsInput = nullptr;
+    if (::CreatePipe(&itsInput, &input_, &inherited, 0) == FALSE) {
+        return;
+    }
+    ::SetHandleInformation(input_, HANDLE_FLAG_INHERIT, 0);
+    HANDLE nowhere = NullDevice(inherited);
+    STARTUPINFOW start{};
+    start.cb = sizeof start;
+    start.dwFlags = STARTF_USESTDHANDLES;
+    start.hStdInput = itsInput;
+    start.hStdOutput = nowhere;
+    start.hStdError = nowhere;
+    PROCESS_INFORMATION made{};
+    std::wstring line = L"cmd.exe /d /q";
+    if (::CreateProcessW(CommandProcessor().c_str(), line.data(), nullptr, nullptr, TRUE, CREATE_NO_WINDOW, nullptr,
+                         nullptr, &start, &made) != FALSE) {
+        bearer_ = made.hProcess;
+        bearerId_ = made.dwProcessId;
+        Close(made.hThread);
+    }
+    Close(itsInput);
+    Close(nowhere);
+}
+
+bool WindowlessConsole::Join() {
+    if (HasConsole() || JoinBearer()) {
+        return true;
+    }
+    if (::AllocConsole() == FALSE) {
+        return false;
+    }
+    ::ShowWindow(::GetConsoleWindow(), SW_HIDE);
+    return true;
+}
+
+bool WindowlessConsole::JoinBearer() const {
+    for (int tried = 0; bearer_ != nullptr && tried < kTries; ++tried) {
+        if (::AttachConsole(bearerId_) != FALSE) {
+            return true;
+        }
+        // Not yet: the command processor has to come to life first. If it ends, it never will.
+        if (::WaitForSingleObject(bearer_, kBetweenTries) == WAIT_OBJECT_0) {
+            return false;
+        }
+    }
+    return false;
+}
+
+}  // namespace platform
