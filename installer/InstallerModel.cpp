@@ -71,10 +71,16 @@ PackageInfo InstallerModel::FindPackage(const std::string& identifier) const {
 }
 
 // Hidden packages do not count here: they are not the user's to choose, and one that needs no host does not save a
-// wizard that has nothing to offer. They stand behind the shown ones.
+// wizard that has nothing to offer.
 bool InstallerModel::AllProductsLackHosts() const {
-    const auto hidden = std::ranges::find(packages, false, &PackageInfo::show);
-    return hidden != packages.begin() && std::all_of(packages.begin(), hidden, LacksHost);
+    bool anyShown = false;
+    for (const PackageInfo& package : packages) {
+        if (package.show && !LacksHost(package)) {
+            return false;
+        }
+        anyShown = anyShown || package.show;
+    }
+    return anyShown;
 }
 
 bool InstallerModel::SomeProductLacksHost() const {
