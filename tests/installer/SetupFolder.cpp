@@ -1,0 +1,64 @@
+#include "tests/installer/SetupFolder.h"
+
+#include <deque>
+#include <utility>
+#include <vector>
+
+#include "hvframework/FileUtils.h"
+#include "installer/InstallerModel.h"
+#include "package/ValidationTable.h"
+
+namespace {
+
+/// The texts of the table, which stay where they are when it grows.
+std::deque<std::string> texts;
+std::vector<HV::ValidationRow> table;
+std::function<void()> whenAsked;
+
+const std::string& Keep(const std::string& text) {
+    return texts.emplace_back(text);
+}
+
+}  // namespace
+
+std::span<const HV::ValidationRow> HV::ValidationRows() {
+    if (const auto action = std::exchange(whenAsked, nullptr)) {
+        action();
+    }
+    return table;
+}
+
+std::string InPackages(const std::string& fileName) {
+    return std::string(kPackages) + "\\" + fileName;
+}
+
+SetupFolder::SetupFolder(Machine& onMachine) : machine_(onMachine) {}
+
+SetupFolder::~SetupFolder() {
+    HV::InstallerModel::Forget();
+    whenAsked = nullptr;
+    table.clear();
+    texts.clear();
+}
+
+std::string SetupFolder::Ships(const PackageBuilder& package) {
+    std::string name = Has(package);
+    Knows(name, HVL::FileUtils::GetFileMD5(InPackages(name)));
+    return name;
+}
+
+std::string SetupFolder::Has(const PackageBuilder& package) {
+    return package.WriteTo(kPackages).filename().string();
+}
+
+void SetupFolder::HasSuite(const std::string& json, const std::string& fileName) {
+    machine_.Has(InPackages(fileName), json);
+}
+
+void SetupFolder::Knows(const std::string& fileName, const std::string& md5) {
+    table.push_back({Keep(fileName), "None", "", "", Keep(md5)});
+}
+
+void SetupFolder::WhenTheTableIsAsked(std::function<void()> action) {
+    whenAsked = std::move(action);
+}

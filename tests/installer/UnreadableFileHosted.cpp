@@ -1,0 +1,33 @@
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "tests/installer/UnreadableFile.h"
+
+namespace {
+
+constexpr uid_t kNobody = 65534;
+
+}  // namespace
+
+struct UnreadableFile::Lock {
+    std::string name;
+    uid_t user = geteuid();
+};
+
+// Root may read everything, so it is not root meanwhile.
+UnreadableFile::UnreadableFile(const Machine& machine, const std::string& path) : lock_(std::make_unique<Lock>()) {
+    lock_->name = machine.HostName(path);
+    EXPECT_EQ(chmod((machine.HostName("C:\\") + "/..").c_str(), 0755), 0);
+    EXPECT_EQ(chmod(lock_->name.c_str(), 0), 0);
+    if (lock_->user == 0) {
+        EXPECT_EQ(seteuid(kNobody), 0);
+    }
+}
+
+UnreadableFile::~UnreadableFile() {
+    if (lock_->user == 0) {
+        EXPECT_EQ(seteuid(lock_->user), 0);
+    }
+    EXPECT_EQ(chmod(lock_->name.c_str(), 0644), 0);
+}
