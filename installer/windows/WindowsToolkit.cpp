@@ -161,11 +161,13 @@ HWND WindowsToolkit::HandleOf(WizardPart part) const {
     return nullptr;
 }
 
-// A control that is hidden or disabled while it has the focus would keep the keyboard to itself.
+// A control that is hidden or disabled while it has the focus keeps the keyboard to itself, or the keyboard is lost.
 void WindowsToolkit::KeepFocusUsable() const {
+    if (window_ == nullptr || ::GetActiveWindow() != *window_) {
+        return;
+    }
     const HWND focus = ::GetFocus();
-    if (focus != nullptr && window_ != nullptr && ::IsChild(*window_, focus) != FALSE &&
-        (::IsWindowVisible(focus) == FALSE || ::IsWindowEnabled(focus) == FALSE)) {
+    if (focus == nullptr || ::IsWindowVisible(focus) == FALSE || ::IsWindowEnabled(focus) == FALSE) {
         ::SetFocus(*window_);
     }
 }

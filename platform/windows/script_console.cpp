@@ -65,6 +65,10 @@ WindowlessConsole::WindowlessConsole() {
 }
 
 WindowlessConsole::~WindowlessConsole() {
+    LetBearerGo();
+}
+
+void WindowlessConsole::LetBearerGo() {
     Close(input_);
     Close(bearer_);
 }
@@ -96,7 +100,9 @@ void WindowlessConsole::StartBearer() {
 }
 
 bool WindowlessConsole::Join() {
-    if (HasConsole() || JoinBearer()) {
+    const bool joined = HasConsole() || JoinBearer();
+    LetBearerGo();
+    if (joined) {
         return true;
     }
     if (::AllocConsole() == FALSE) {

@@ -23,19 +23,20 @@ public:
     /// Starts the command processor, which takes its time, unless this program has a console already.
     WindowlessConsole();
 
-    /// Lets the command processor end.
+    /// Lets the command processor end, unless Join() has.
     ~WindowlessConsole();
 
     WindowlessConsole(const WindowlessConsole&) = delete;
     WindowlessConsole& operator=(const WindowlessConsole&) = delete;
 
-    /// Joins the console, once the command processor has it. Where that fails the program gets an ordinary console,
-    /// whose window is hidden at once. Returns whether the program has a console now.
+    /// Joins the console, once the command processor has it, and lets that end. Where that fails the program gets an
+    /// ordinary console, whose window is hidden at once. Returns whether the program has a console now.
     bool Join();
 
 private:
     void StartBearer();
     [[nodiscard]] bool JoinBearer() const;
+    void LetBearerGo();
 
     HANDLE bearer_ = nullptr;  // the command processor
     DWORD bearerId_ = 0;
