@@ -1,5 +1,7 @@
 #include "installer/StartUp.h"
 
+#include <log4cpp/Appender.hh>
+
 #include "hvdeploy/src/Logging.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
@@ -43,9 +45,11 @@ std::string PackagesDirectoryPath() {
 void StartLogging() {
     const std::string file = ChoosePropertyFile();
     // Twice, and it stays so: pairs are what the start of a wizard looks like to those who read its log. A property
-    // file that lets the test lines through gets each of them twice, and a refusal is reported twice. No other line is:
-    // the second round takes the appenders of the first away.
+    // file that lets the test lines through gets each of them twice, and a refusal is reported twice. The second round
+    // puts new appenders in the place of the first's, which the library then forgets: a file that such a one held open
+    // could not be rolled over.
     (void)ConfigureLogging(file);
+    log4cpp::Appender::closeAll();
     (void)ConfigureLogging(file);
     Log::General().setPriority(log4cpp::Priority::DEBUG);
     Log::Detail().setPriority(log4cpp::Priority::DEBUG);

@@ -126,6 +126,23 @@ TEST_F(StartLoggingTest, TestsTheLogTwiceAndLogsEveryOtherLineOnce) {
               test + test + "DEBUG hvdeploy-detail: a line;DEBUG halvorn: another;");
 }
 
+// A file that something still holds open is not renamed on Windows.
+TEST_F(StartLoggingTest, LetsALogThatIsFullBeRolledOver) {
+    machine.HasFolder(R"(C:\Own)");
+    machine.Has(R"(C:\Own\own.log)", std::string(100, '.'));
+    machine.Has(kPropertyFile,
+                "log4cpp.rootCategory=INFO, file\n"
+                "log4cpp.appender.file=RollingFileAppender\n"
+                "log4cpp.appender.file.maxFileSize=100\n"
+                "log4cpp.appender.file.maxBackupIndex=1\n"
+                "log4cpp.appender.file.fileName=C:\\Own\\own.log\n"
+                "log4cpp.appender.file.layout=PatternLayout\n"
+                "log4cpp.appender.file.layout.ConversionPattern=%m;\n");
+    Start();
+    EXPECT_EQ(machine.Content(R"(C:\Own\own.log.1)").substr(0, 100), std::string(100, '.'));
+    EXPECT_EQ(CountOf("another;", machine.Content(R"(C:\Own\own.log)")), 1U);
+}
+
 TEST_F(StartLoggingTest, LogsEverythingWhateverThePropertyFileSays) {
     machine.HasFolder(R"(C:\Own)");
     machine.Has(kPropertyFile, OwnProperties("ERROR") +
