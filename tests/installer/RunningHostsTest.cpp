@@ -17,9 +17,9 @@ const ShownBox kAfterEffectsRuns = HostsRun(
     "After Effects is a host application for products in the installer; please quit this application and "
     "retry or cancel to exit the installer.");
 
-class WizardChecks : public WizardTest {
+class RunningHosts : public WizardTest {
 protected:
-    WizardChecks() {
+    RunningHosts() {
         HasHostsOf("motion-design");
         Ships(HostProduct("glow", "aftereffects"));
         Ships(Product("titler"));
@@ -39,14 +39,14 @@ protected:
     }
 };
 
-TEST_F(WizardChecks, PassWhereNothingRuns) {
+TEST_F(RunningHosts, LetTheInstallBeginWhenThereAreNone) {
     GoToSelection();
     Install();
     EXPECT_EQ(wizard.state, WizardState::Installing);
     EXPECT_TRUE(toolkit.boxes.empty());
 }
 
-TEST_F(WizardChecks, StopAtTheManager) {
+TEST_F(RunningHosts, AreNotReachedWhenTheManagersBoxIsCancelled) {
     const RunningProgram manager(machine, kManager);
     GoToSelection();
     toolkit.AnswerNext(kCancel);
@@ -55,7 +55,7 @@ TEST_F(WizardChecks, StopAtTheManager) {
     EXPECT_EQ(toolkit.exits, std::vector{0U});
 }
 
-TEST_F(WizardChecks, LookForTheManagerAgainAtEachRetry) {
+TEST_F(RunningHosts, AreReachedWhenTheManagerHasGoneAtARetry) {
     RunningProgram manager(machine, kManager);
     GoToSelection();
     toolkit.AnswerNext(kRetry);
@@ -65,7 +65,7 @@ TEST_F(WizardChecks, LookForTheManagerAgainAtEachRetry) {
     EXPECT_EQ(wizard.state, WizardState::Installing);
 }
 
-TEST_F(WizardChecks, LookForTheManagerBeforeTheHosts) {
+TEST_F(RunningHosts, AreLookedForBehindTheManager) {
     RunningProgram manager(machine, kManager);
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
@@ -75,7 +75,7 @@ TEST_F(WizardChecks, LookForTheManagerBeforeTheHosts) {
     EXPECT_EQ(toolkit.boxes, (std::vector{kManagerRuns, kAfterEffectsRuns}));
 }
 
-TEST_F(WizardChecks, GoOnWhenTheManagersBoxGivesNeitherRetryNorCancel) {
+TEST_F(RunningHosts, AreReachedWhenTheManagersBoxGivesNeitherRetryNorCancel) {
     const RunningProgram manager(machine, kManager);
     GoToSelection();
     toolkit.AnswerNext(0);
@@ -84,7 +84,7 @@ TEST_F(WizardChecks, GoOnWhenTheManagersBoxGivesNeitherRetryNorCancel) {
     EXPECT_EQ(wizard.state, WizardState::Installing);
 }
 
-TEST_F(WizardChecks, StopAtARunningHost) {
+TEST_F(RunningHosts, EndTheProcessAtCancel) {
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
     toolkit.AnswerNext(kCancel);
@@ -95,7 +95,7 @@ TEST_F(WizardChecks, StopAtARunningHost) {
         (std::vector<std::string>{"MessageBeep 48", "MessageBoxA \"Host applications running.\"", "ExitProcess 0"}));
 }
 
-TEST_F(WizardChecks, GoOnWhenTheHostIsGoneAtTheRetry) {
+TEST_F(RunningHosts, AreLookedForAgainAtEachRetry) {
     RunningProgram host(machine, kAfterEffects);
     GoToSelection();
     toolkit.AnswerNext(kRetry);
@@ -105,7 +105,7 @@ TEST_F(WizardChecks, GoOnWhenTheHostIsGoneAtTheRetry) {
     EXPECT_EQ(wizard.state, WizardState::Installing);
 }
 
-TEST_F(WizardChecks, GoOnWhenTheHostsBoxGivesNeitherRetryNorCancel) {
+TEST_F(RunningHosts, MayStayWhenTheirBoxGivesNeitherRetryNorCancel) {
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
     toolkit.AnswerNext(kOk);
@@ -114,7 +114,7 @@ TEST_F(WizardChecks, GoOnWhenTheHostsBoxGivesNeitherRetryNorCancel) {
     EXPECT_EQ(wizard.state, WizardState::Installing);
 }
 
-TEST_F(WizardChecks, NameEachCopyOfAHost) {
+TEST_F(RunningHosts, AreNamedOncePerCopy) {
     const RunningProgram one(machine, kAfterEffects);
     RunningProgram two(machine, kOlderAfterEffects);
     GoToSelection();
@@ -128,7 +128,7 @@ TEST_F(WizardChecks, NameEachCopyOfAHost) {
                            kAfterEffectsRuns}));
 }
 
-TEST_F(WizardChecks, CountTheHostsOfProductsThatAreNotChosen) {
+TEST_F(RunningHosts, CountWithoutTheirProductsBeingChosen) {
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
     toolkit.Toggle("com.halvorn.glow");
@@ -137,7 +137,7 @@ TEST_F(WizardChecks, CountTheHostsOfProductsThatAreNotChosen) {
     EXPECT_EQ(toolkit.boxes, std::vector{kAfterEffectsRuns});
 }
 
-TEST_F(WizardChecks, ComeAfterTheChoice) {
+TEST_F(RunningHosts, AreLookedForBehindTheChoice) {
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
     toolkit.DeselectAll();
@@ -146,7 +146,7 @@ TEST_F(WizardChecks, ComeAfterTheChoice) {
     EXPECT_EQ(toolkit.boxes, std::vector{kNothingSelected});
 }
 
-TEST_F(WizardChecks, FailOnAHostWhoseNameIsTooShortToBeTold) {
+TEST_F(RunningHosts, EndInAnErrorThatNobodyCatchesWhenTheirNameIsTooShort) {
     // Premiere Pro is searched for in the whole path, so a program in a folder of that name is one; and the text for
     // the box cannot be made from three letters. Nothing on the way catches that.
     Ships(HostProduct("cuts", "premiere"));
@@ -156,9 +156,9 @@ TEST_F(WizardChecks, FailOnAHostWhoseNameIsTooShortToBeTold) {
     EXPECT_TRUE(toolkit.boxes.empty());
 }
 
-class WizardChecksWithoutHosts : public WizardTest {};
+class RunningHostsUnused : public WizardTest {};
 
-TEST_F(WizardChecksWithoutHosts, DoNotMindAHostThatNoPackageUses) {
+TEST_F(RunningHostsUnused, AreNotMinded) {
     Ships(Product("titler"));
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
