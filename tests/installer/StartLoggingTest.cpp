@@ -153,6 +153,14 @@ TEST_F(StartLoggingTest, LogsEverythingWhateverThePropertyFileSays) {
     EXPECT_EQ(machine.Content(R"(C:\Own\own.log)"), "DEBUG hvdeploy-detail: a line;DEBUG halvorn: another;");
 }
 
+TEST_F(StartLoggingTest, LeavesThresholdsOfThePropertyFileAsTheyAre) {
+    machine.HasFolder(R"(C:\Own)");
+    machine.Has(kPropertyFile, OwnProperties("INFO") + "log4cpp.appender.file.threshold=ERROR\n");
+    Start();
+    EXPECT_EQ(machine.Content(R"(C:\Own\own.log)"), "");
+    ExpectEverythingIsLogged();
+}
+
 TEST_F(StartLoggingTest, GoesOnWithAPropertyFileThatIsRefused) {
     machine.Has(kPropertyFile, "log4cpp.rootCategory=INFO, nobody\n");
     Start();
