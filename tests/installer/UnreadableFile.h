@@ -5,8 +5,8 @@
 
 #include "tests/support/Machine.h"
 
-/// While it lives, the file is there and cannot be read: by its rights on the hosted machine, by another's handle on
-/// Windows. What cannot be arranged fails the test.
+/// While it lives, the file (hosted: or the folder) is there and cannot be read: by its rights on the hosted machine,
+/// by another's handle on Windows. What cannot be arranged fails the test.
 class UnreadableFile {
 public:
     UnreadableFile(const Machine& machine, const std::string& path);
