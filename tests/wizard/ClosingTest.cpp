@@ -1,0 +1,79 @@
+#include "tests/wizard/WizardTest.h"
+
+namespace {
+
+using ClosingTest = WizardTest;
+
+TEST_F(ClosingTest, TheTitleBarEndsTheFirstPage) {
+    HasHosts("everything");
+    RunningWizard wizard(folder);
+    wizard.PageWith(id::Agree);
+    RunningWizard::CloseFromTitleBar(wizard.Window());
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+}
+
+TEST_F(ClosingTest, TheTitleBarEndsTheSelection) {
+    HasHosts("everything");
+    RunningWizard wizard(folder);
+    GoToSelection(wizard);
+    RunningWizard::CloseFromTitleBar(wizard.Window());
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_FALSE(IsRegistered());
+}
+
+TEST_F(ClosingTest, TheTitleBarEndsAnInstallWithoutWaitingForIt) {
+    HasHosts("everything");
+    HoldAtScript("requirements");
+    RunningWizard wizard(folder);
+    GoToInstalling(wizard);
+    WaitUntilHeld();
+    RunningWizard::CloseFromTitleBar(wizard.Window());
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_TRUE(machine().HasFile(R"(C:\hold.txt)"));
+    LetGo();
+    EXPECT_FALSE(IsRegistered());
+}
+
+TEST_F(ClosingTest, TheTitleBarEndsTheFinishedWizard) {
+    HasHosts("everything");
+    RunningWizard wizard(folder);
+    GoToFinal(wizard);
+    RunningWizard::CloseFromTitleBar(wizard.Window());
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_TRUE(IsRegistered());
+}
+
+TEST_F(ClosingTest, DisagreeEndsTheWizard) {
+    HasHosts("everything");
+    RunningWizard wizard(folder);
+    const auto before = machine().FilesWithoutFolders();
+    wizard.Press(wizard.PageWith(id::Disagree), id::Disagree);
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_EQ(machine().FilesWithoutFolders(), before);
+}
+
+TEST_F(ClosingTest, CancelEndsTheFirstPageAndTheSelection) {
+    HasHosts("everything");
+    const auto before = machine().FilesWithoutFolders();
+    {
+        RunningWizard wizard(folder);
+        wizard.Press(wizard.Window(), id::Cancel);
+        EXPECT_EQ(wizard.ExitStatus(), 0U);
+    }
+    RunningWizard wizard(folder);
+    GoToSelection(wizard);
+    wizard.Press(wizard.Window(), id::Cancel);
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_EQ(machine().FilesWithoutFolders(), before);
+}
+
+TEST_F(ClosingTest, AViewerThatIsOpenGoesWithTheWizard) {
+    HasHosts("everything");
+    RunningWizard wizard(folder);
+    wizard.Press(wizard.PageWith(id::ReadLicense), id::ReadLicense);
+    EXPECT_TRUE(Eventually([&] { return wizard.Viewers().size() == 1; }));
+    wizard.Press(wizard.Window(), id::Cancel);
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+}
+
+}  // namespace

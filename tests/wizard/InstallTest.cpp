@@ -1,0 +1,213 @@
+#include <algorithm>
+#include <map>
+
+#include "tests/support/RunProgram.h"
+#include "tests/wizard/WizardTest.h"
+
+namespace {
+
+/// What an installation has left behind.
+struct Left {
+    std::map<std::string, std::string> files;
+    std::string registry;
+    bool operator==(const Left&) const = default;
+};
+
+class InstallTest : public WizardTest {
+protected:
+    [[nodiscard]] Left WhatIsLeft() { return {machine().Files(), machine().Registry()}; }
+
+    /// The same installation by the argument line, on another machine of the same kind.
+    Left ByArgumentLine(const std::string& hosts, const std::vector<std::string>& more) {
+        StartOver();
+        HasHosts(hosts);
+        std::vector<std::string> arguments = {"dir=" + folder + "\\packages", "--legacyuninstall",
+                                              R"(log=C:\ProgramData\Halvorn\Logs\line.log)"};
+        arguments.insert(arguments.end(), more.begin(), more.end());
+        EXPECT_EQ(RunProgram("hvdeploy", arguments).exitStatus, 0);
+        return WhatIsLeft();
+    }
+
+    /// The names of those that differ; contents would drown a report.
+    static std::vector<std::string> Differences(const Left& one, const Left& other) {
+        std::vector<std::string> names;
+        for (const auto& [name, content] : one.files) {
+            const auto found = other.files.find(name);
+            if (found == other.files.end() || found->second != content) {
+                names.push_back(name);
+            }
+        }
+        for (const auto& [name, content] : other.files) {
+            if (one.files.count(name) == 0) {
+                names.push_back(name);
+            }
+        }
+        return names;
+    }
+};
+
+TEST_F(InstallTest, InstallsTheReleaseToTheFinalPage) {
+    HasHosts("everything");
+    RunningWizard wizard(folder);
+    const HWND window = wizard.Window();
+    const RECT start = OnScreen(window);
+    GoToInstalling(wizard);
+
+    // The window is 600, 650, 700, 750 and 800 wide in turn, and never anything else.
+    std::vector<LONG> widths;
+    EXPECT_TRUE(Eventually([&] {
+        const RECT now = OnScreen(window);
+        const LONG width = now.right - now.left;
+        if (widths.empty() || widths.back() != width) {
+            widths.push_back(width);
+            EXPECT_EQ((width - 600) % 50, 0) << width;
+            EXPECT_EQ(now,
+                      (RECT{start.left - (width - 600) / 2, start.top, start.right + (width - 600) / 2, start.bottom}));
+        }
+        return width >= 800;
+    }));
+    EXPECT_EQ(widths.front(), 600);
+    EXPECT_EQ(widths.back(), 800);
+    EXPECT_TRUE(std::is_sorted(widths.begin(), widths.end()));
+
+    ExpectControls(window, {{id::Continue, {495, 358, 575, 383}, 0x5801000B, false, false},
+                            {id::Back, {405, 358, 485, 383}, 0x5801000B, false, false},
+                            {id::Cancel, {195, 358, 275, 383}, 0x5001000B, false, true},
+                            {id::WhatsNew, {145, 358, 275, 383}, 0x5001000B, true, true},
+                            {id::Resources, {280, 358, 410, 383}, 0x5001000B, true, true},
+                            {id::Close, {645, 358, 775, 383}, 0x5001000B, true, true}});
+    const HWND page = wizard.PageWithoutControls();
+    EXPECT_EQ(InParent(page), (RECT{0, 0, 800, 354}));
+    RECT client{};
+    GetClientRect(window, &client);
+    EXPECT_TRUE(wizard.Shows(window, {look::ImageWithin(HV_RESOURCES "/final.bmp", {0, 0, client.right, 350}),
+                                      look::Button("What's New...", {145, 358, 275, 383}, look::Face, look::Strip),
+                                      look::Button("Resources...", {280, 358, 410, 383}, look::Face, look::Strip),
+                                      look::Button("Close", {645, 358, 775, 383}, look::Face, look::Strip),
+                                      look::Filled({0, 383, client.right, client.bottom}, look::Strip)}));
+    KeepPicture("final", window);
+    wizard.Press(window, id::Close);
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_TRUE(IsRegistered());
+}
+
+TEST_F(InstallTest, LeavesWhatTheArgumentLineLeaves) {
+    HasHosts("everything");
+    {
+        RunningWizard wizard(folder);
+        GoToFinal(wizard);
+        wizard.Press(wizard.Window(), id::Close);
+        EXPECT_EQ(wizard.ExitStatus(), 0U);
+    }
+    const Left byWizard = WhatIsLeft();
+    EXPECT_GT(byWizard.files.size(), 150U);
+    const Left byLine = ByArgumentLine("everything", {});
+    EXPECT_EQ(Differences(byWizard, byLine), std::vector<std::string>());
+    EXPECT_EQ(byWizard.registry, byLine.registry);
+}
+
+TEST_F(InstallTest, LeavesOutWhatIsSwitchedOff) {
+    HasHosts("everything");
+    {
+        RunningWizard wizard(folder);
+        GoToSelection(wizard);
+        wizard.Press(wizard.Page(), ProductId(1));
+        wizard.Press(wizard.Page(), ProductId(7));
+        wizard.Press(wizard.Window(), id::Continue);
+        EXPECT_TRUE(Eventually([&] { return GetDlgItem(wizard.Window(), id::Close) != nullptr; }));
+        wizard.Press(wizard.Window(), id::Close);
+        EXPECT_EQ(wizard.ExitStatus(), 0U);
+    }
+    const Left byWizard = WhatIsLeft();
+    int glow = 0;
+    int titler = 0;
+    int grain = 0;
+    for (const auto& [name, content] : byWizard.files) {
+        if (name.rfind(folder, 0) != 0) {
+            glow += name.find("Glow") != std::string::npos || name.find("tessaly.glow") != std::string::npos;
+            titler += name.find("Titler") != std::string::npos || name.find("tessaly.titler") != std::string::npos;
+            grain += name.find("Grain") != std::string::npos;
+        }
+    }
+    EXPECT_EQ(glow, 0);
+    EXPECT_EQ(titler, 0);
+    EXPECT_GT(grain, 0);
+    const Left byLine = ByArgumentLine("everything", {"skip=com.halvorn.tessaly.glow,com.halvorn.tessaly.titler"});
+    EXPECT_EQ(Differences(byWizard, byLine), std::vector<std::string>());
+    EXPECT_EQ(byWizard.registry, byLine.registry);
+}
+
+/// How many columns of the bar are filled; -1 when it is no bar.
+int FillOf(const Picture& page) {
+    int fill = 0;
+    while (fill < 390 && page.At(fill, 76) == look::Fill) {
+        ++fill;
+    }
+    const bool isBar = page.IsAll({0, 76, fill, 88}, look::Fill) && page.IsAll({fill, 76, 390, 88}, look::Track);
+    return isBar ? fill : -1;
+}
+
+bool IsWholePercent(int fill) {
+    for (int percent = 0; percent <= 100; ++percent) {
+        if (percent * 390 / 100 == fill) {
+            return true;
+        }
+    }
+    return false;
+}
+
+TEST_F(InstallTest, ShowsHowFarItIs) {
+    HasHosts("everything");
+    HoldAtScript("requirements");
+    RunningWizard wizard(folder);
+    GoToInstalling(wizard);
+    const HWND window = wizard.Window();
+    const HWND page = wizard.PageWithoutControls();
+    EXPECT_EQ(InParent(page), (RECT{170, 37, 580, 345}));
+    WaitUntilHeld();
+
+    EXPECT_TRUE(
+        wizard.Shows(page, {look::Words("Installing Tessaly Suite, please wait...", {1, 46, 390, 68}, look::Wait,
+                                        look::OneLine, look::Text, look::Page),
+                            look::Filled({0, 0, 410, 46}, look::Page), look::Filled({390, 46, 410, 308}, look::Page),
+                            look::Filled({0, 113, 410, 308}, look::Page)}));
+    int fill = 0;
+    EXPECT_TRUE(Eventually([&] { return (fill = FillOf(Picture::OfClient(page))) > 0; }));
+    EXPECT_LT(fill, 390);
+    EXPECT_TRUE(IsWholePercent(fill)) << fill;
+    EXPECT_FALSE(Picture::OfClient(page).IsAll({1, 94, 370, 113}, look::Page)) << "no status is to be seen";
+    EXPECT_TRUE(wizard.Shows(window, {look::Button("Install", {495, 358, 575, 383}, look::DisabledFace, look::Strip),
+                                      look::Button("Back", {405, 358, 485, 383}, look::DisabledFace, look::Strip),
+                                      look::Button("Cancel", {195, 358, 275, 383}, look::Face, look::Strip)}));
+    KeepPicture("installing", window);
+
+    LetGo();
+    EXPECT_TRUE(Eventually([&] { return GetDlgItem(window, id::Close) != nullptr; }));
+}
+
+TEST_F(InstallTest, EndsAtOnceWhenCancelledInTheMiddle) {
+    HasHosts("everything");
+    HoldAtScript("requirements");
+    RunningWizard wizard(folder);
+    GoToInstalling(wizard);
+    WaitUntilHeld();
+    wizard.Press(wizard.Window(), id::Cancel);
+    // The script still waits; nobody waits for it.
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    EXPECT_TRUE(machine().HasFile(R"(C:\hold.txt)"));
+    LetGo();
+    EXPECT_FALSE(IsRegistered());
+}
+
+TEST_F(InstallTest, EndsWhenCancelledBeforeItsFirstStep) {
+    HasHosts("everything");
+    HoldAtScript("announce");
+    RunningWizard wizard(folder);
+    GoToSelection(wizard);
+    wizard.PressBoth(wizard.Window(), id::Continue, id::Cancel);
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    LetGo();
+    EXPECT_FALSE(IsRegistered());
+}
+
+}  // namespace

@@ -1,0 +1,272 @@
+#include "tests/wizard/RunningWizard.h"
+
+#include <algorithm>
+#include <cstdlib>
+
+namespace {
+
+constexpr DWORD kMinute = 60000;
+constexpr DWORD kPoll = 20;
+constexpr int kBoxText = 0xFFFF;
+
+std::vector<HWND> ChildrenOf(HWND parent) {
+    std::vector<HWND> children;
+    for (HWND child = GetWindow(parent, GW_CHILD); child != nullptr; child = GetWindow(child, GW_HWNDNEXT)) {
+        children.push_back(child);
+    }
+    return children;
+}
+
+bool IsPage(HWND window) {
+    return ClassOf(window).rfind("ATL:", 0) == 0;
+}
+
+bool WaitUntilUsable(HWND parent, int id) {
+    return Eventually([=] {
+        const HWND button = GetDlgItem(parent, id);
+        return button != nullptr && IsWindowVisible(button) && IsWindowEnabled(button);
+    });
+}
+
+}  // namespace
+
+bool Eventually(const std::function<bool()>& question) {
+    const ULONGLONG start = GetTickCount64();
+    while (!question()) {
+        if (GetTickCount64() - start > kMinute) {
+            return false;
+        }
+        Sleep(kPoll);
+    }
+    return true;
+}
+
+std::string TextOf(HWND window) {
+    std::string text(4096, '\0');
+    DWORD_PTR length = 0;
+    // Asked of the window itself: a control's own text is not to be had otherwise from another process.
+    SendMessageTimeoutA(window, WM_GETTEXT, text.size(), reinterpret_cast<LPARAM>(text.data()), SMTO_NORMAL, kMinute,
+                        &length);
+    text.resize(length);
+    return text;
+}
+
+std::string ClassOf(HWND window) {
+    char name[256];
+    return {name, static_cast<std::size_t>(std::max(GetClassNameA(window, name, sizeof name), 0))};
+}
+
+RECT OnScreen(HWND window) {
+    RECT part{};
+    GetWindowRect(window, &part);
+    return part;
+}
+
+RECT InParent(HWND window) {
+    RECT part = OnScreen(window);
+    MapWindowPoints(nullptr, GetParent(window), reinterpret_cast<POINT*>(&part), 2);
+    return part;
+}
+
+RunningWizard::RunningWizard(const std::string& folder) {
+    STARTUPINFOA start{};
+    start.cb = sizeof start;
+    std::string line = "\"" + folder + "\\hvinstaller.exe\"";
+    if (!CreateProcessA(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &start, &process_)) {
+        ADD_FAILURE() << "cannot start " << line << ": error " << GetLastError();
+    }
+}
+
+RunningWizard::~RunningWizard() {
+    if (IsRunning()) {
+        TerminateProcess(process_.hProcess, 1);
+        WaitForSingleObject(process_.hProcess, kMinute);
+    }
+    CloseHandle(process_.hThread);
+    CloseHandle(process_.hProcess);
+}
+
+bool RunningWizard::IsRunning() const {
+    return WaitForSingleObject(process_.hProcess, 0) == WAIT_TIMEOUT;
+}
+
+std::optional<DWORD> RunningWizard::ExitStatus() {
+    DWORD status = 0;
+    if (WaitForSingleObject(process_.hProcess, kMinute) != WAIT_OBJECT_0 ||
+        !GetExitCodeProcess(process_.hProcess, &status)) {
+        return std::nullopt;
+    }
+    return status;
+}
+
+std::vector<HWND> RunningWizard::TopWindows() const {
+    struct Search {
+        DWORD process;
+        std::vector<HWND> found;
+    } search{process_.dwProcessId, {}};
+    EnumWindows(
+        [](HWND window, LPARAM parameter) -> BOOL {
+            auto& of = *reinterpret_cast<Search*>(parameter);
+            DWORD owner = 0;
+            GetWindowThreadProcessId(window, &owner);
+            if (owner == of.process && IsWindowVisible(window)) {
+                of.found.push_back(window);
+            }
+            return TRUE;
+        },
+        reinterpret_cast<LPARAM>(&search));
+    std::sort(search.found.begin(), search.found.end());
+    return search.found;
+}
+
+HWND RunningWizard::Window() {
+    const bool found = window_ != nullptr || Eventually([this] {
+                           for (const HWND window : TopWindows()) {
+                               if (GetDlgItem(window, 1124) != nullptr) {
+                                   window_ = window;
+                               }
+                           }
+                           return window_ != nullptr;
+                       });
+    EXPECT_TRUE(found) << "the main window does not come";
+    return window_;
+}
+
+HWND RunningWizard::Page() {
+    for (const HWND child : ChildrenOf(Window())) {
+        if (IsPage(child) && IsWindowVisible(child)) {
+            return child;
+        }
+    }
+    return nullptr;
+}
+
+HWND RunningWizard::PageWith(int id) {
+    HWND page = nullptr;
+    EXPECT_TRUE(Eventually([&] {
+        page = Page();
+        return page != nullptr && GetDlgItem(page, id) != nullptr;
+    })) << "no page with the control "
+        << id;
+    return page;
+}
+
+HWND RunningWizard::PageWithoutControls() {
+    HWND page = nullptr;
+    EXPECT_TRUE(Eventually([&] {
+        page = Page();
+        return page != nullptr && GetWindow(page, GW_CHILD) == nullptr;
+    })) << "no page without controls";
+    return page;
+}
+
+std::vector<HWND> RunningWizard::Viewers() const {
+    std::vector<HWND> viewers = TopWindows();
+    std::erase_if(viewers, [](HWND window) { return GetDlgItem(window, 1184) == nullptr; });
+    return viewers;
+}
+
+std::vector<Control> RunningWizard::Controls(HWND parent) {
+    std::vector<Control> controls;
+    for (const HWND child : ChildrenOf(parent)) {
+        if (!IsPage(child)) {
+            controls.push_back({child, GetDlgCtrlID(child), ClassOf(child), InParent(child),
+                                static_cast<DWORD>(GetWindowLongA(child, GWL_STYLE)) & ~(WS_VISIBLE | WS_DISABLED),
+                                (GetWindowLongA(child, GWL_STYLE) & WS_VISIBLE) != 0, IsWindowEnabled(child) != FALSE});
+        }
+    }
+    return controls;
+}
+
+Control RunningWizard::ControlOf(HWND parent, int id) {
+    for (const Control& control : Controls(parent)) {
+        if (control.id == id) {
+            return control;
+        }
+    }
+    ADD_FAILURE() << "no control " << id;
+    return {};
+}
+
+void RunningWizard::Press(HWND parent, int id) {
+    ASSERT_TRUE(WaitUntilUsable(parent, id)) << "button " << id << " cannot be pressed";
+    DWORD_PTR result = 0;
+    EXPECT_NE(SendMessageTimeoutA(GetDlgItem(parent, id), BM_CLICK, 0, 0, SMTO_NORMAL, kMinute, &result), 0)
+        << "button " << id << " does not come up again";
+}
+
+void RunningWizard::PressForBox(HWND parent, int id) {
+    ASSERT_TRUE(WaitUntilUsable(parent, id)) << "button " << id << " cannot be pressed";
+    PostMessageA(GetDlgItem(parent, id), BM_CLICK, 0, 0);
+}
+
+void RunningWizard::PressBoth(HWND parent, int first, int second) {
+    ASSERT_TRUE(WaitUntilUsable(parent, first)) << "button " << first << " cannot be pressed";
+    ASSERT_TRUE(WaitUntilUsable(parent, second)) << "button " << second << " cannot be pressed";
+    // Posted messages come before timers.
+    PostMessageA(GetDlgItem(parent, first), BM_CLICK, 0, 0);
+    PostMessageA(GetDlgItem(parent, second), BM_CLICK, 0, 0);
+}
+
+void RunningWizard::CloseFromTitleBar(HWND window) {
+    PostMessageA(window, WM_SYSCOMMAND, SC_CLOSE, 0);
+}
+
+bool RunningWizard::HasBox() const {
+    const std::vector<HWND> windows = TopWindows();
+    return std::any_of(windows.begin(), windows.end(), [](HWND window) { return ClassOf(window) == "#32770"; });
+}
+
+Box RunningWizard::WaitForBox(const std::string& title) {
+    Box box;
+    EXPECT_TRUE(Eventually([&] {
+        for (const HWND window : TopWindows()) {
+            if (ClassOf(window) == "#32770" && TextOf(window) == title) {
+                box.handle = window;
+            }
+        }
+        return box.handle != nullptr;
+    })) << "no box \""
+        << title << "\"";
+    box.title = TextOf(box.handle);
+    box.text = TextOf(GetDlgItem(box.handle, kBoxText));
+    box.owner = GetWindow(box.handle, GW_OWNER);
+    for (const HWND child : ChildrenOf(box.handle)) {
+        if (ClassOf(child) == "Button" && IsWindowVisible(child)) {
+            box.buttons.push_back(GetDlgCtrlID(child));
+        }
+        DWORD_PTR icon = 0;
+        if (ClassOf(child) == "Static" && SendMessageTimeoutA(child, STM_GETICON, 0, 0, SMTO_NORMAL, kMinute, &icon)) {
+            box.hasIcon = box.hasIcon || icon != 0;
+        }
+    }
+    std::sort(box.buttons.begin(), box.buttons.end());
+    return box;
+}
+
+void RunningWizard::Answer(const Box& box, int button) {
+    PostMessageA(GetDlgItem(box.handle, button), BM_CLICK, 0, 0);
+    EXPECT_TRUE(Eventually([&] { return !IsWindow(box.handle); })) << "the box \"" << box.title << "\" stays";
+}
+
+testing::AssertionResult RunningWizard::Shows(HWND window, const std::vector<look::Mark>& marks) {
+    Picture picture(0, 0);
+    const auto isMissing = [&](const look::Mark& mark) { return !mark.isIn(picture); };
+    const bool shown = !marks.empty() && Eventually([&] {
+        picture = Picture::OfClient(window);
+        return std::none_of(marks.begin(), marks.end(), isMissing);
+    });
+    if (shown) {
+        return testing::AssertionSuccess();
+    }
+    auto failure = testing::AssertionFailure() << "not to be seen:";
+    for (const look::Mark& mark : marks) {
+        if (isMissing(mark)) {
+            failure << "\n  " << mark.description;
+        }
+    }
+    const std::string saved =
+        R"(Z:\tmp\wizard-)" + std::to_string(GetCurrentProcessId()) + "-" + std::to_string(GetTickCount64()) + ".bmp";
+    picture.Save(saved);
+    return failure << "\nthe picture is " << saved;
+}

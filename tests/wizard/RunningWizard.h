@@ -1,0 +1,98 @@
+#pragma once
+
+#include <gtest/gtest.h>
+#include <windows.h>
+
+#include <functional>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "tests/wizard/Look.h"
+
+/// Asks again every 20 ms until the answer is yes; whether it came within a minute, the time that a busy machine may
+/// take for anything.
+bool Eventually(const std::function<bool()>& question);
+
+/// A control as another process sees it. The rectangle is that of its parent's client area.
+struct Control {
+    HWND handle = nullptr;
+    int id = 0;
+    std::string kind;  // the window class
+    RECT part{};
+    DWORD style = 0;  // without "visible" and "disabled"
+    bool visible = false;
+    bool enabled = false;
+};
+
+/// A modal box.
+struct Box {
+    HWND handle = nullptr;
+    std::string title;
+    std::string text;
+    std::vector<int> buttons;  // identifiers, in ascending order
+    HWND owner = nullptr;
+    bool hasIcon = false;
+};
+
+/// A wizard that a user has started: another process, seen and handled from outside as far as its windows allow.
+///
+/// Waits are questions asked again; see Eventually(). What does not come about fails the test. A wizard that still runs
+/// at the end is ended.
+class RunningWizard {
+public:
+    /// Starts hvinstaller.exe in this folder.
+    explicit RunningWizard(const std::string& folder);
+    ~RunningWizard();
+    RunningWizard(const RunningWizard&) = delete;
+    RunningWizard& operator=(const RunningWizard&) = delete;
+
+    /// The main window, once it is to be seen. It is the one with the buttons.
+    HWND Window();
+    /// The page that is visible now; null between two pages.
+    [[nodiscard]] HWND Page();
+    /// Waits for a visible page that has, or has not, a control of this identifier.
+    HWND PageWith(int id);
+    HWND PageWithoutControls();
+
+    /// Every agreement viewer that is open, in the order of their handles.
+    [[nodiscard]] std::vector<HWND> Viewers() const;
+
+    /// The direct children of a window which are controls (pages are not), in the order in which they were made.
+    [[nodiscard]] static std::vector<Control> Controls(HWND parent);
+    [[nodiscard]] static Control ControlOf(HWND parent, int id);
+
+    /// Presses a button as a user could: it must be there, visible and enabled, or becomes so. Press() is over when the
+    /// program has dealt with it; PressForBox() at once, since a modal box keeps the program in there.
+    void Press(HWND parent, int id);
+    void PressForBox(HWND parent, int id);
+    /// Two presses, one straight after the other, before the program has time for anything else.
+    void PressBoth(HWND parent, int first, int second);
+    /// The close box of a window's title bar.
+    static void CloseFromTitleBar(HWND window);
+
+    /// Waits for a modal box with this title.
+    Box WaitForBox(const std::string& title);
+    void Answer(const Box& box, int button);
+    [[nodiscard]] bool HasBox() const;
+
+    /// Whether the client area comes to show all of these, and, when not, which ones it does not.
+    testing::AssertionResult Shows(HWND window, const std::vector<look::Mark>& marks);
+
+    /// Waits for the end of the process, and gives its exit status.
+    std::optional<DWORD> ExitStatus();
+    [[nodiscard]] bool IsRunning() const;
+    [[nodiscard]] DWORD Id() const { return process_.dwProcessId; }
+
+private:
+    [[nodiscard]] std::vector<HWND> TopWindows() const;
+
+    PROCESS_INFORMATION process_{};
+    HWND window_ = nullptr;
+};
+
+std::string TextOf(HWND window);
+std::string ClassOf(HWND window);
+/// Outer rectangle on the screen, and the part of a parent's client area that a child takes.
+RECT OnScreen(HWND window);
+RECT InParent(HWND window);
