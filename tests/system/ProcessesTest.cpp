@@ -14,9 +14,28 @@ using HV::HostDisplayName;
 using HV::Processes;
 using HV::ProcessRecord;
 
-std::vector<std::string> PathsByName(const Processes& processes, const std::string& name) {
+/// Leaves those on drive C: what runs outside of the machine may have any name.
+std::vector<ProcessRecord> OnTheMachine(std::vector<ProcessRecord> found) {
+    std::erase_if(found, [](const ProcessRecord& record) { return !record.fullPath.starts_with("C:\\"); });
+    return found;
+}
+
+std::vector<ProcessRecord> FoundByName(const Processes& processes, const std::string& name) {
     std::vector<ProcessRecord> found;
-    processes.FindByName(name, found);
+    const bool any = processes.FindByName(name, found);
+    EXPECT_EQ(any, !found.empty());
+    return OnTheMachine(found);
+}
+
+std::vector<ProcessRecord> FoundByPath(const Processes& processes, const std::string& fragment) {
+    std::vector<ProcessRecord> found;
+    const bool any = processes.FindByPath(fragment, found);
+    EXPECT_EQ(any, !found.empty());
+    return OnTheMachine(found);
+}
+
+std::vector<std::string> PathsByName(const Processes& processes, const std::string& name) {
+    const auto found = FoundByName(processes, name);
     std::vector<std::string> paths;
     std::ranges::transform(found, std::back_inserter(paths), &ProcessRecord::fullPath);
     return paths;
@@ -51,8 +70,7 @@ TEST(Processes, SeeEachOfTwoCopies) {
     Machine machine;
     const RunningProgram first(machine, R"(C:\Program Files\Adobe\Adobe After Effects 2021\AfterFX.exe)");
     const RunningProgram second(machine, R"(C:\Program Files\Adobe\Adobe After Effects 2022\AfterFX.exe)");
-    std::vector<ProcessRecord> found;
-    EXPECT_TRUE(Processes().FindByName("AfterFX.exe", found));
+    const auto found = FoundByName(Processes(), "AfterFX.exe");
     ASSERT_EQ(found.size(), 2U);
     EXPECT_NE(found[0].processId, found[1].processId);
     EXPECT_NE(found[0].fullPath, found[1].fullPath);
@@ -62,8 +80,7 @@ TEST(Processes, SeeAProgramByItsFolder) {
     Machine machine;
     const std::string path = R"(C:\Program Files\Adobe Premiere Pro.exe\helper.exe)";
     const RunningProgram helper(machine, path);
-    std::vector<ProcessRecord> found;
-    EXPECT_TRUE(Processes().FindByPath("Adobe Premiere Pro.exe", found));
+    const auto found = FoundByPath(Processes(), "Adobe Premiere Pro.exe");
     ASSERT_EQ(found.size(), 1U);
     EXPECT_EQ(found[0].fullPath, path);
     EXPECT_EQ(found[0].name, "helper.exe");
@@ -75,8 +92,7 @@ TEST(Processes, NameAPathBeyondAsciiInUtf8) {
         "C:\\Program Files\\\xC3\x9C"
         "berblendung\\Schnitt\xC3\xBC.exe";
     const RunningProgram program(machine, path);
-    std::vector<ProcessRecord> found;
-    EXPECT_TRUE(Processes().FindByName("Schnitt\xC3\xBC.exe", found));
+    const auto found = FoundByName(Processes(), "Schnitt\xC3\xBC.exe");
     ASSERT_EQ(found.size(), 1U);
     EXPECT_EQ(found[0].fullPath, path);
 }
@@ -88,9 +104,7 @@ TEST(Processes, TakesMoreThanOneSnapshotOfManyPrograms) {
     for (; rounds < 5; ++rounds) {
         const RunningProgram program(machine, "C:\\Programs\\Round" + std::to_string(rounds) + ".exe");
         processes.Refresh();
-        std::vector<ProcessRecord> found;
-        EXPECT_TRUE(processes.FindByPath("C:\\Programs\\Round", found));
-        EXPECT_EQ(found.size(), 1U);
+        EXPECT_EQ(FoundByPath(processes, "C:\\Programs\\Round").size(), 1U);
     }
     EXPECT_EQ(rounds, 5);
 }
