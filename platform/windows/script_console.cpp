@@ -117,6 +117,10 @@ bool WindowlessConsole::JoinBearer() const {
         if (::AttachConsole(bearerId_) != FALSE) {
             return true;
         }
+        // A program may have been given a console that leads nowhere; it lets go of that first.
+        if (::GetLastError() == ERROR_ACCESS_DENIED) {
+            ::FreeConsole();
+        }
         // Not yet: the command processor has to come to life first. If it ends, it never will.
         if (::WaitForSingleObject(bearer_, kBetweenTries) == WAIT_OBJECT_0) {
             return false;
