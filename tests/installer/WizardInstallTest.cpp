@@ -220,6 +220,20 @@ TEST_F(FailingInstall, EndsWhenThePackagesFolderHasGone) {
     EXPECT_EQ(machine.Content(PlaceOf("glow")), "the old one");
 }
 
+TEST_F(FailingInstall, EndsWhenThePackagesFolderGoesAfterTheEngineHasStarted) {
+    GoToSelection();
+    output.gate.HoldAt("hvdeploy version");
+    Install();
+    ASSERT_TRUE(output.gate.WaitUntilHeld());
+    RemovePackagesFolder();
+    EndTheRun();
+    toolkit.AnswerNext(kOk);
+    TickToTheEnd();
+    EXPECT_EQ(toolkit.boxes, std::vector{kInstallationFailed});
+    EXPECT_EQ(toolkit.Installing().status, kFailureText);
+    EXPECT_EQ(machine.Content(PlaceOf("glow")), "the old one");
+}
+
 TEST_F(FailingInstall, EndsWhenAPackageHasBeenSpoiledSinceTheStart) {
     GoToSelection();
     machine.Has(InPackages("com.halvorn.glow.hvpkg"), "no archive");
