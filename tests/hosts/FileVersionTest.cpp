@@ -31,6 +31,13 @@ TEST_F(FileVersion, IsTheFileVersionWhereTheProductVersionIsZero) {
     EXPECT_EQ(version.text, "12.1.0");
 }
 
+TEST_F(FileVersion, IsTheProductVersionAsSoonAsEitherHalfOfItIsNotZero) {
+    EXPECT_TRUE(Ask(TestExecutable("upper-half")));
+    EXPECT_EQ(version.text, "13.300.0");
+    EXPECT_TRUE(Ask(TestExecutable("lower-half")));
+    EXPECT_EQ(version.text, "0.0.65535");
+}
+
 TEST_F(FileVersion, IsNotThereWithoutAVersionBlock) {
     EXPECT_FALSE(Ask(TestExecutable("no-version")));
     EXPECT_EQ(version.text, "");
