@@ -27,7 +27,8 @@ std::string OfxFolder() {
     return GetSystemDirectory(SysDir::Ofx).string();
 }
 
-/// Writes `text` and the key's handle to standard output, as one line.
+/// Writes `text` and the key's handle to standard output, as one line. Not into the log, whatever its level: who reads
+/// the listing of hosts on a machine with EDIUS knows these lines and passes over them.
 void PrintHandle(const char* text, const Win32RegKeyHandle& key) {
     std::ostringstream line;
     line << text << "0x" << std::hex << reinterpret_cast<std::uintptr_t>(key.key);
@@ -79,6 +80,7 @@ std::string VegasExecutable(const std::string& appDir) {
 }
 
 HostRecord MakeVegas(const std::string& version, const std::string& appDir, const std::string& helpFolder) {
+    // It has no display name: a version of Vegas is told by its number alone, and listings have never shown another.
     HostRecord host = FreshRecord(HostType::Vegas, "vegas");
     host.hostVersion = version;
     host.hostAppPath = VegasExecutable(appDir);
@@ -135,6 +137,8 @@ bool MediaComposerDetector_Win::Run(std::vector<HostRecord>& hosts) {
         !OpenSoftwareKey("Avid Technology\\AVX Plug-ins", plugins)) {
         return false;
     }
+    // The two keys are proof enough: values that are missing leave their fields empty, and the host counts all the
+    // same.
     HostRecord host = FreshRecord(HostType::MediaComposer, "mediacomposer");
     host.hostDisplayName = HVL::FileUtils::GetFileName(ReadText(application, "InstallDir"));
     host.hostVersion = ReadText(application, "Version");

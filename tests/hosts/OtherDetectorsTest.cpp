@@ -214,6 +214,14 @@ TEST_F(HitFilmDetector, CountsAProductThatDoesNotSayWhereItIs) {
     EXPECT_EQ(hosts.front().hostPluginPath, kOfxFolder);
 }
 
+TEST_F(HitFilmDetector, PutsNoSeparatorBehindAFolderThatComesWithoutOne) {
+    HasKey("FXHOME\\HitFilm Pro\\Paths", {{"Application", R"(C:\FXHOME\HitFilm Pro)"}});
+    EXPECT_TRUE(Run());
+    ASSERT_EQ(hosts.size(), 1U);
+    EXPECT_EQ(hosts.front().hostAppPath, R"(C:\FXHOME\HitFilm ProHitFilmPro.exe)");
+    EXPECT_EQ(hosts.front().hostDisplayName, "HitFilm Pro");
+}
+
 class MediaComposerDetector : public DetectorTest<HV::MediaComposerDetector_Win> {};
 
 TEST_F(MediaComposerDetector, FindsNothingOnACleanMachine) {
