@@ -51,6 +51,14 @@ TEST_F(RegistryEntriesTest, AreStoredAsExpandableText) {
     EXPECT_EQ(log.Lines(), std::vector<std::string>{DebugLine("HV::Deploy::HV::Deploy::MakeRegistryEntry")});
 }
 
+// Asked of the registry's text, because reading a value puts a terminator behind it that may not be stored.
+TEST_F(RegistryEntriesTest, AreStoredWithTheirTerminator) {
+    entry.value = "ab";
+    EXPECT_EQ(engine.MakeRegistryEntry(entry), 0);
+    const std::string registry = machine.Registry();
+    EXPECT_NE(registry.find("\"Folder\"=hex(2):61,62,00\n"), std::string::npos) << registry;
+}
+
 TEST_F(RegistryEntriesTest, OfAnotherSystemAreNotWritten) {
     const std::string before = machine.Registry();
     int seen = 0;

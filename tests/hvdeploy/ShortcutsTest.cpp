@@ -158,6 +158,24 @@ TEST_F(ShortcutsTest, DoNotPointToWhatIsGone) {
     ExpectRefusal("Shortcut source path not found.");
 }
 
+TEST_F(ShortcutsTest, HaveNoFolderMadeForATargetThatIsNotFound) {
+    shortcut.subdir = R"(Halvorn\Glow)";
+    placed.clear();
+    ExpectRefusal("Shortcut source path not found.");
+    placed = {R"(C:\Gone\Glow.exe)"};
+    ExpectRefusal("Shortcut source path not found.");
+}
+
+TEST_F(ShortcutsTest, AskForTheKeywordThenTheFolderThenTheTarget) {
+    placed.clear();
+    shortcut.sysdir = "desktop";
+    ExpectRefusal("Invalid sysdir specified for shortcut.");
+    shortcut.sysdir = "absolutepath";
+    ExpectRefusal("Empty shortcut system directory specification.");
+    shortcut.subdir = kProgram;
+    ExpectRefusal("Shortcut source path not found.");
+}
+
 TEST_F(ShortcutsTest, OfFoldersPointToTheTextFromTheFirstSharedCharacterOn) {
     int seen = 0;
     for (const std::string type : {"dir", "bundle"}) {
