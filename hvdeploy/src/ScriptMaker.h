@@ -16,7 +16,7 @@ public:
     /// What every script begins with. Its lines end in single carriage returns, and no line end follows the last.
     std::string GetHeader() const;
 
-    /// A line that prints `text`.
+    /// A line that prints `text`, which stands in it as it is: quotes would be printed too.
     std::string MakeEchoLine(const std::string& text) const { return "echo " + text; }
 
     /// A line that deletes `path`, with all that matches it below.

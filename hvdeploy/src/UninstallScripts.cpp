@@ -22,6 +22,8 @@ using namespace HVL::FileUtils;
 constexpr const char* kScriptFolder = "C:\\ProgramData\\Halvorn\\uninstall";
 constexpr const char* kUninstallKey = "HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall\\";
 
+// The version is part of the name, so a new version gets an entry of its own, and the older one stays until its script
+// removes it.
 std::string EntryName(const HVL::ProductData& product) {
     return product.GetDisplayName() + " v" + product.GetVersion();
 }
@@ -220,6 +222,8 @@ void OSRegisterUninstall(const std::string& scriptPath, const HVL::ProductData& 
     int minorNumber = 0;
     int patchNumber = 0;
     HVL::Version(product.GetVersion()).GetShortParts(majorNumber, minorNumber, patchNumber);
+    // These values and no others: a size, a display version or links are left out on purpose, because administrators
+    // tell the entries of a suite apart by their names and compare the rest value by value.
     SetText(entry.key, "DisplayName", product.GetDisplayName());
     SetNumber(entry.key, "MajorVersion", majorNumber);
     SetNumber(entry.key, "MinorVersion", minorNumber);
