@@ -1,5 +1,6 @@
 // Other programs hear of registry entries, and only on Windows are there other programs.
 #include <atomic>
+#include <chrono>
 #include <future>
 #include <thread>
 
@@ -53,6 +54,34 @@ private:
     DWORD threadId_ = 0;
 };
 
+/// A top-level window whose program has stopped to answer.
+class HungProgram {
+public:
+    HungProgram() {
+        std::promise<bool> ready;
+        thread_ = std::thread([this, &ready] {
+            HWND const window = CreateWindowA("STATIC", "", WS_POPUP, 0, 0, 1, 1, nullptr, nullptr, nullptr, nullptr);
+            ready.set_value(window != nullptr);
+            end_.get_future().wait();
+            DestroyWindow(window);
+        });
+        hasWindow_ = ready.get_future().get();
+    }
+    ~HungProgram() {
+        end_.set_value();
+        thread_.join();
+    }
+    HungProgram(const HungProgram&) = delete;
+    HungProgram& operator=(const HungProgram&) = delete;
+
+    bool HasWindow() const { return hasWindow_; }
+
+private:
+    std::promise<void> end_;
+    std::thread thread_;
+    bool hasWindow_ = false;
+};
+
 HV::RegistryEntry Entry() {
     HV::RegistryEntry entry;
     entry.os = "windows";
@@ -82,4 +111,14 @@ TEST_F(SideActionsTest, ARegistryEntryThatIsNotWrittenIsNotAnnounced) {
     entry.key = R"(SOFTWARE\)" + std::string(300, 'x');
     EXPECT_EQ(engine.MakeRegistryEntry(entry), -1);
     EXPECT_EQ(announcements, 0);
+}
+
+TEST_F(SideActionsTest, ARegistryEntryWaitsForNoProgramThatDoesNotAnswer) {
+    const HungProgram program;
+    ASSERT_TRUE(program.HasWindow());
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_EQ(engine.MakeRegistryEntry(Entry()), 0) << "what becomes of the announcement does not count";
+    // A second is what one such program may cost.
+    const auto took = std::chrono::steady_clock::now() - start;
+    EXPECT_LT(took, std::chrono::seconds(10));
 }
