@@ -34,7 +34,7 @@ protected:
 };
 
 TEST_F(AgreementTest, ShowsTheAgreementInAWindowOfItsOwn) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND viewer = Open(wizard);
 
@@ -65,7 +65,7 @@ TEST_F(AgreementTest, ShowsTheAgreementInAWindowOfItsOwn) {
 }
 
 TEST_F(AgreementTest, SetsTheTextInFromTheEdges) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND text = GetDlgItem(Open(wizard), 0);
     RECT client{};
@@ -82,7 +82,7 @@ TEST_F(AgreementTest, SetsTheTextInFromTheEdges) {
 }
 
 TEST_F(AgreementTest, OpensAnotherViewerEachTimeAndTheWizardGoesOn) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND first = Open(wizard);
     const HWND second = Open(wizard);
@@ -98,7 +98,7 @@ TEST_F(AgreementTest, OpensAnotherViewerEachTimeAndTheWizardGoesOn) {
 }
 
 TEST_F(AgreementTest, SavesTheBytesOfTheDocument) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND viewer = Open(wizard);
     wizard.PressForBox(viewer, id::SaveLicense);
@@ -118,7 +118,7 @@ TEST_F(AgreementTest, SavesTheBytesOfTheDocument) {
 }
 
 TEST_F(AgreementTest, WritesNothingWhenSavingIsCancelled) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND viewer = Open(wizard);
     const auto before = machine().Files();

@@ -5,7 +5,7 @@ namespace {
 using ClosingTest = WizardTest;
 
 TEST_F(ClosingTest, TheTitleBarEndsTheFirstPage) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     wizard.PageWith(id::Agree);
     RunningWizard::CloseFromTitleBar(wizard.Window());
@@ -13,7 +13,7 @@ TEST_F(ClosingTest, TheTitleBarEndsTheFirstPage) {
 }
 
 TEST_F(ClosingTest, TheTitleBarEndsTheSelection) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToSelection(wizard);
     RunningWizard::CloseFromTitleBar(wizard.Window());
@@ -22,7 +22,7 @@ TEST_F(ClosingTest, TheTitleBarEndsTheSelection) {
 }
 
 TEST_F(ClosingTest, TheTitleBarEndsAnInstallWithoutWaitingForIt) {
-    HasHosts("everything");
+    HasEveryHost();
     HoldAtScript("requirements");
     RunningWizard wizard(folder);
     GoToInstalling(wizard);
@@ -35,7 +35,7 @@ TEST_F(ClosingTest, TheTitleBarEndsAnInstallWithoutWaitingForIt) {
 }
 
 TEST_F(ClosingTest, TheTitleBarEndsTheFinishedWizard) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToFinal(wizard);
     RunningWizard::CloseFromTitleBar(wizard.Window());
@@ -44,7 +44,7 @@ TEST_F(ClosingTest, TheTitleBarEndsTheFinishedWizard) {
 }
 
 TEST_F(ClosingTest, DisagreeEndsTheWizard) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const auto before = machine().FilesWithoutFolders();
     wizard.Press(wizard.PageWith(id::Disagree), id::Disagree);
@@ -53,7 +53,7 @@ TEST_F(ClosingTest, DisagreeEndsTheWizard) {
 }
 
 TEST_F(ClosingTest, CancelEndsTheFirstPageAndTheSelection) {
-    HasHosts("everything");
+    HasEveryHost();
     const auto before = machine().FilesWithoutFolders();
     {
         RunningWizard wizard(folder);
@@ -68,7 +68,7 @@ TEST_F(ClosingTest, CancelEndsTheFirstPageAndTheSelection) {
 }
 
 TEST_F(ClosingTest, AViewerThatIsOpenGoesWithTheWizard) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     wizard.Press(wizard.PageWith(id::ReadLicense), id::ReadLicense);
     EXPECT_TRUE(Eventually([&] { return wizard.Viewers().size() == 1; }));

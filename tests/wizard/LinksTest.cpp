@@ -5,7 +5,7 @@ namespace {
 using LinksTest = WizardTest;
 
 TEST_F(LinksTest, OpensBothPagesInTheBrowser) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToFinal(wizard);
     const std::string opened = R"(C:\browser.txt)";

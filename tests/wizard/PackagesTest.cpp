@@ -13,7 +13,7 @@ protected:
         ExpectBox(box, text, {IDOK}, true, nullptr);
         EXPECT_TRUE(IsWindowVisible(wizard.Window()));
         KeepPicture("box", wizard.Window());
-        wizard.Answer(box, box.buttons.front());
+        wizard.AnswerOk(box);
         EXPECT_EQ(wizard.ExitStatus(), 0U);
     }
 
@@ -40,21 +40,21 @@ protected:
 };
 
 TEST_F(PackagesTest, RefusesAPackageWithAChangedByte) {
-    HasHosts("everything");
+    HasEveryHost();
     BreakPackage("com.halvorn.tessaly.glow.zip");
     RunningWizard wizard(folder);
     ExpectEnd(wizard, invalid, invalidText);
 }
 
 TEST_F(PackagesTest, RefusesAPackageThatItDoesNotKnow) {
-    HasHosts("everything");
+    HasEveryHost();
     machine().Has(folder + R"(\packages\com.halvorn.other.zip)", "anything");
     RunningWizard wizard(folder);
     ExpectEnd(wizard, invalid, invalidText);
 }
 
 TEST_F(PackagesTest, RefusesAFolderWithoutASuite) {
-    HasHosts("everything");
+    HasEveryHost();
     RemovePackage("suite.json");
     RunningWizard wizard(folder);
     ExpectEnd(wizard, invalid, invalidText);
@@ -76,12 +76,12 @@ TEST_F(PackagesTest, EndsBeforeAnyWindowWithoutThePackagesFolder) {
         "This installer application has been moved. It must be run from its original folder containing a packages "
         "directory. The installer will now exit.",
         {IDOK}, true, nullptr);
-    wizard.Answer(box, box.buttons.front());
+    wizard.AnswerOk(box);
     EXPECT_EQ(wizard.ExitStatus(), 0U);
 }
 
 TEST_F(PackagesTest, WithNothingToChooseTheFirstButtonInstalls) {
-    HasHosts("everything");
+    HasEveryHost();
     KeepOnly({"imagecore", "colorscience"});
     RunningWizard wizard(folder);
     const HWND window = wizard.Window();

@@ -18,7 +18,7 @@ protected:
 
     static void GoOnToSelection(RunningWizard& wizard) {
         const Box warning = wizard.WaitForBox("Warning: missing hosts.");
-        wizard.Answer(warning, warning.buttons.front());
+        wizard.AnswerOk(warning);
         GoToSelection(wizard);
     }
 };

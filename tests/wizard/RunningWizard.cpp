@@ -71,6 +71,8 @@ RECT InParent(HWND window) {
 RunningWizard::RunningWizard(const std::string& folder) {
     STARTUPINFOA start{};
     start.cb = sizeof start;
+    // Without standard streams, as the desktop starts it.
+    start.dwFlags = STARTF_USESTDHANDLES;
     std::string line = "\"" + folder + "\\hvinstaller.exe\"";
     if (!CreateProcessA(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, nullptr, &start, &process_)) {
         ADD_FAILURE() << "cannot start " << line << ": error " << GetLastError();
@@ -247,6 +249,11 @@ Box RunningWizard::WaitForBox(const std::string& title) {
 void RunningWizard::Answer(const Box& box, int button) {
     PostMessageA(GetDlgItem(box.handle, button), BM_CLICK, 0, 0);
     EXPECT_TRUE(Eventually([&] { return !IsWindow(box.handle); })) << "the box \"" << box.title << "\" stays";
+}
+
+void RunningWizard::AnswerOk(const Box& box) {
+    ASSERT_EQ(box.buttons.size(), 1U) << box.title;
+    Answer(box, box.buttons.front());
 }
 
 testing::AssertionResult RunningWizard::Shows(HWND window, const std::vector<look::Mark>& marks) {

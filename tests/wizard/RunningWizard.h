@@ -74,6 +74,8 @@ public:
     /// Waits for a modal box with this title.
     Box WaitForBox(const std::string& title);
     void Answer(const Box& box, int button);
+    /// A box with one button.
+    void AnswerOk(const Box& box);
     [[nodiscard]] bool HasBox() const;
 
     /// Whether the client area comes to show all of these, and, when not, which ones it does not.

@@ -22,8 +22,10 @@ bool IsHeld(const std::string& line) {
     return !held.empty() && line.find(held) != std::string::npos;
 }
 
+/// And by which number it can be waited for.
 void SayThatItWaits() {
     if (FILE* const file = std::fopen("C:\\held.txt", "wb")) {
+        std::fprintf(file, "%lu", GetCurrentProcessId());
         std::fclose(file);
     }
 }
@@ -38,8 +40,10 @@ std::string Arguments(const std::string& line) {
 
 int main() {
     const std::string line = GetCommandLineA();
-    for (int polls = 0; IsHeld(line) && polls < 6000; ++polls) {
+    if (IsHeld(line)) {
         SayThatItWaits();
+    }
+    for (int polls = 0; IsHeld(line) && polls < 6000; ++polls) {
         Sleep(20);
     }
     std::string command = R"(C:\windows\system32\cmd.exe)" + Arguments(line);

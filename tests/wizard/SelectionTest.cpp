@@ -18,7 +18,7 @@ protected:
 };
 
 TEST_F(SelectionTest, OffersEveryProductInTwoColumns) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToSelection(wizard);
     const HWND window = wizard.Window();
@@ -46,7 +46,7 @@ TEST_F(SelectionTest, OffersEveryProductInTwoColumns) {
 }
 
 TEST_F(SelectionTest, ChecksAndUnchecksOneByOneAndAllTogether) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToSelection(wizard);
     const HWND page = wizard.Page();
@@ -68,7 +68,7 @@ TEST_F(SelectionTest, ChecksAndUnchecksOneByOneAndAllTogether) {
 }
 
 TEST_F(SelectionTest, KeepsTheChoiceThroughATripToTheFirstPage) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToSelection(wizard);
     const HWND window = wizard.Window();
@@ -90,7 +90,7 @@ TEST_F(SelectionTest, KeepsTheChoiceThroughATripToTheFirstPage) {
 }
 
 TEST_F(SelectionTest, AsksForAProductWhenNoneIsChosen) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     GoToSelection(wizard);
     const HWND window = wizard.Window();
@@ -98,7 +98,7 @@ TEST_F(SelectionTest, AsksForAProductWhenNoneIsChosen) {
     wizard.PressForBox(window, id::Continue);
     const Box box = wizard.WaitForBox("No Products Selected");
     ExpectBox(box, "Please select at least one plugin to install.", {IDOK}, false, window);
-    wizard.Answer(box, box.buttons.front());
+    wizard.AnswerOk(box);
     EXPECT_TRUE(wizard.Shows(wizard.PageWith(id::DeselectAll), Boxes(All(false), All(true))));
     EXPECT_TRUE(Eventually([&] { return IsWindowEnabled(window) != FALSE; }));
     EXPECT_FALSE(IsRegistered());
@@ -113,7 +113,7 @@ TEST_F(SelectionTest, GreysWhatLacksItsHostsAndLeavesItOff) {
               {IDOK}, true, nullptr);
     EXPECT_TRUE(IsWindowVisible(wizard.Window()));
     KeepPicture("missing-hosts", wizard.Window());
-    wizard.Answer(box, box.buttons.front());
+    wizard.AnswerOk(box);
 
     GoToSelection(wizard);
     const HWND page = wizard.Page();

@@ -37,7 +37,7 @@ std::vector<look::Mark> WelcomeTexts() {
 using WelcomeTest = WizardTest;
 
 TEST_F(WelcomeTest, StandsInTheMiddleOfTheScreenAndCannotBeResized) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND window = wizard.Window();
 
@@ -57,7 +57,7 @@ TEST_F(WelcomeTest, StandsInTheMiddleOfTheScreenAndCannotBeResized) {
 }
 
 TEST_F(WelcomeTest, ShowsItsTextsAndButtonsInTheirPlaces) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND window = wizard.Window();
     const HWND page = wizard.PageWith(id::Agree);
@@ -83,7 +83,7 @@ TEST_F(WelcomeTest, ShowsItsTextsAndButtonsInTheirPlaces) {
 }
 
 TEST_F(WelcomeTest, LightsContinueOnlyOnceTheUserAgrees) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND window = wizard.Window();
     const HWND page = wizard.PageWith(id::Agree);
@@ -106,7 +106,7 @@ TEST_F(WelcomeTest, LightsContinueOnlyOnceTheUserAgrees) {
 }
 
 TEST_F(WelcomeTest, PaintsItselfAgainWhereAnotherWindowHasLain) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND window = wizard.Window();
     EXPECT_TRUE(wizard.Shows(window, Frame(window)));
@@ -121,7 +121,7 @@ TEST_F(WelcomeTest, PaintsItselfAgainWhereAnotherWindowHasLain) {
 }
 
 TEST_F(WelcomeTest, GrowsByFiftyAStepAndStopsAtItsWidth) {
-    HasHosts("everything");
+    HasEveryHost();
     RunningWizard wizard(folder);
     const HWND window = wizard.Window();
     const RECT start = OnScreen(window);

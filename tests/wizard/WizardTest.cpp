@@ -41,6 +41,22 @@ void CopyRelease(const std::string& to) {
     ASSERT_FALSE(error) << error.message();
 }
 
+/// Registry text without the sections whose keys begin like this.
+std::string Without(const std::string& key, const std::string& text) {
+    std::istringstream lines(text);
+    std::string kept;
+    bool isLeftOut = false;
+    for (std::string line; std::getline(lines, line);) {
+        if (line.rfind('[', 0) == 0) {
+            isLeftOut = line.rfind("[" + key, 0) == 0;
+        }
+        if (!isLeftOut) {
+            kept += line + '\n';
+        }
+    }
+    return kept;
+}
+
 }  // namespace
 
 WizardTest::WizardTest() : folder(Variable("HV_WALK_RELEASE").empty() ? R"(C:\Release)" : Variable("HV_WALK_RELEASE")) {
@@ -57,6 +73,13 @@ void WizardTest::StartOver() {
 
 void WizardTest::HasHosts(const std::string& name) {
     machine().Loads(ReadHostFile(HV_SAMPLE_MACHINES "/" + name + ".reg"));
+}
+
+void WizardTest::HasEveryHost() {
+    const std::string all = ReadHostFile(HV_SAMPLE_MACHINES "/everything.reg");
+    const std::string kept = Without(R"(HKEY_LOCAL_MACHINE\SOFTWARE\FXHOME\HitFilm)", all);
+    EXPECT_LT(kept.size(), all.size());
+    machine().Loads(kept);
 }
 
 void WizardTest::BreakPackage(const std::string& name) {
@@ -78,11 +101,19 @@ void WizardTest::HoldAtScript(const std::string& part) {
 }
 
 void WizardTest::WaitUntilHeld() {
-    EXPECT_TRUE(Eventually([this] { return machine().HasFile(R"(C:\held.txt)"); })) << "no script is held";
+    EXPECT_TRUE(Eventually([this] {
+        return machine().HasFile(R"(C:\held.txt)") && !machine().Content(R"(C:\held.txt)").empty();
+    })) << "no script is held";
 }
 
 void WizardTest::LetGo() {
+    const DWORD id = std::strtoul(machine().Content(R"(C:\held.txt)").c_str(), nullptr, 10);
+    const HANDLE gate = OpenProcess(SYNCHRONIZE, FALSE, id);
+    EXPECT_NE(gate, nullptr) << "the script is not held any more";
     DeleteFileA(R"(C:\hold.txt)");
+    // It has inherited the wizard's files, which cannot be cleared away before.
+    EXPECT_EQ(WaitForSingleObject(gate, 60000), WAIT_OBJECT_0);
+    CloseHandle(gate);
 }
 
 void WizardTest::GoToSelection(RunningWizard& wizard) {
@@ -134,8 +165,12 @@ void WizardTest::KeepPicture(const std::string& name, HWND window) {
     }
 }
 
+std::string WizardTest::Registry() const {
+    return Without(R"(HKEY_LOCAL_MACHINE\SYSTEM\CurrentControlSet\Hardware Profiles)", machine().Registry());
+}
+
 bool WizardTest::IsRegistered() const {
-    return machine().Registry().find(R"(CurrentVersion\Uninstall\)") != std::string::npos;
+    return Registry().find(R"(CurrentVersion\Uninstall\)") != std::string::npos;
 }
 
 bool operator==(const RECT& one, const RECT& other) {

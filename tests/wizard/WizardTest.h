@@ -38,6 +38,9 @@ protected:
 
     /// The host applications of this file of samples/machines.
     void HasHosts(const std::string& name);
+    /// Hosts for every product, without HitFilm: where that is, a process that just comes or goes is taken for a host
+    /// without a name, and that ends the wizard. Tests without a window know more of it.
+    void HasEveryHost();
     /// Puts a changed byte into a package, or takes it away.
     void BreakPackage(const std::string& name);
     void RemovePackage(const std::string& name);
@@ -67,6 +70,8 @@ protected:
     /// Keeps a picture of the window with its frame, when pictures are asked for.
     static void KeepPicture(const std::string& name, HWND window);
 
+    /// The registry as the machine gives it, without the display's own entries, which come with the first window.
+    [[nodiscard]] std::string Registry() const;
     /// Whether the list of installed programs names the suite.
     [[nodiscard]] bool IsRegistered() const;
 
