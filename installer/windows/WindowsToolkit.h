@@ -13,7 +13,7 @@ namespace HV {
 ///
 /// Windows and pages that it has made are not released before the process ends. Throws std::runtime_error when the
 /// system refuses a window.
-class WindowsToolkit final : public WizardToolkit {
+class WindowsToolkit : public WizardToolkit {
 public:
     InstallerWindow* CreateInstallerWindow(WinWizardController& controller, const std::string& caption) override;
     WelcomePage* CreateWelcomePage(WinWizardController& controller, InstallerWindow& window) override;

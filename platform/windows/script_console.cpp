@@ -1,5 +1,7 @@
 #include "platform/windows/script_console.h"
 
+#include <fcntl.h>
+
 #include <array>
 #include <cstdint>
 #include <string>
@@ -11,18 +13,37 @@ namespace {
 constexpr int kTries = 500;
 constexpr DWORD kBetweenTries = 10;  // milliseconds
 
-bool LeadsSomewhere(FILE* stream) {
+HANDLE HandleOf(FILE* stream) {
     const int descriptor = _fileno(stream);
-    return descriptor >= 0 && _get_osfhandle(descriptor) != -1;
+    // NOLINTNEXTLINE(performance-no-int-to-ptr): the runtime gives handles as numbers.
+    return descriptor < 0 ? INVALID_HANDLE_VALUE : reinterpret_cast<HANDLE>(_get_osfhandle(descriptor));
 }
 
-void OpenUnlessItLeadsSomewhere(FILE* stream, const char* mode, DWORD standard) {
-    if (LeadsSomewhere(stream) || std::freopen("NUL", mode, stream) == nullptr) {
+// Runtimes differ in what they open where there is nothing: no descriptor, or one onto no handle. Neither has a type.
+bool LeadsSomewhere(FILE* stream) {
+    return ::GetFileType(HandleOf(stream)) != FILE_TYPE_UNKNOWN;
+}
+
+// A program without streams has streams of the runtime that have no descriptor, which freopen refuses or opens under
+// some other number. The numbers matter: what the runtime starts gets 0, 1 and 2.
+void OpenUnlessItLeadsSomewhere(int number, FILE* stream, const char* mode, DWORD standard) {
+    if (LeadsSomewhere(stream)) {
         return;
     }
+    const int nowhere = _open("NUL", _O_RDWR);
+    if (nowhere < 0) {
+        return;
+    }
+    if (nowhere != number) {
+        _dup2(nowhere, number);
+        _close(nowhere);
+    }
+    FILE* const opened = _fileno(stream) < 0 ? _fdopen(number, mode) : nullptr;
+    if (opened != nullptr) {
+        *stream = *opened;
+    }
     // The runtime does this by itself for console programs alone, and not every reader asks the runtime.
-    // NOLINTNEXTLINE(performance-no-int-to-ptr): the runtime gives handles as numbers.
-    ::SetStdHandle(standard, reinterpret_cast<HANDLE>(_get_osfhandle(_fileno(stream))));
+    ::SetStdHandle(standard, HandleOf(stream));
 }
 
 // The command processor of the system, and no other that a search path might lead to: this program runs with high
@@ -52,10 +73,9 @@ void Close(HANDLE& handle) {
 }  // namespace
 
 void OpenMissingStandardStreams() {
-    // In the order of their numbers: each takes the lowest number that is free.
-    OpenUnlessItLeadsSomewhere(stdin, "r", STD_INPUT_HANDLE);
-    OpenUnlessItLeadsSomewhere(stdout, "w", STD_OUTPUT_HANDLE);
-    OpenUnlessItLeadsSomewhere(stderr, "w", STD_ERROR_HANDLE);
+    OpenUnlessItLeadsSomewhere(0, stdin, "r", STD_INPUT_HANDLE);
+    OpenUnlessItLeadsSomewhere(1, stdout, "w", STD_OUTPUT_HANDLE);
+    OpenUnlessItLeadsSomewhere(2, stderr, "w", STD_ERROR_HANDLE);
 }
 
 WindowlessConsole::WindowlessConsole() {

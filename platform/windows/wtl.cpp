@@ -12,13 +12,14 @@ namespace {
 constexpr std::size_t kLongestPath = 32768;
 constexpr LPARAM kHeldDown = 0x40000000;
 
-// Return presses the button that has the focus. Buttons that their owner draws do not ask for it by themselves.
+// Return presses the button that has the focus, once however long it is held. Buttons that their owner draws do not ask
+// for it by themselves.
 bool PressesButton(const MSG& message) {
-    if (message.message != WM_KEYDOWN || message.wParam != VK_RETURN || (message.lParam & kHeldDown) != 0 ||
+    if (message.message != WM_KEYDOWN || message.wParam != VK_RETURN ||
         (::SendMessageW(message.hwnd, WM_GETDLGCODE, VK_RETURN, 0) & DLGC_BUTTON) == 0) {
         return false;
     }
-    if (::IsWindowEnabled(message.hwnd) != FALSE) {
+    if ((message.lParam & kHeldDown) == 0 && ::IsWindowEnabled(message.hwnd) != FALSE) {
         ::SendMessageW(message.hwnd, BM_CLICK, 0, 0);
     }
     return true;
