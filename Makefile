@@ -53,7 +53,7 @@ format: setup
 	@git ls-files '*.h' '*.cpp' | xargs clang-format -i
 
 tidy: build-hosted
-	@git ls-files '*.cpp' ':!platform/windows/*' ':!tests/*Windows*' | xargs -P 2 -n 4 clang-tidy --quiet -p build/hosted
+	@git ls-files '*.cpp' ':!*/windows/*' ':!tests/wizard/*' ':!tests/*Windows*' | xargs -P 2 -n 4 clang-tidy --quiet -p build/hosted
 
 clean:
 	@rm -rf build dist
