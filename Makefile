@@ -7,10 +7,12 @@ SHELL := /bin/bash
 export CCACHE_BASEDIR := $(CURDIR)
 export CCACHE_NOHASHDIR := 1
 
-.PHONY: help setup demo demo-windows test test-hosted test-asan test-tsan test-windows bench format tidy clean
+.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench format tidy clean
 
 help:
-	@echo "make demo | demo-windows      install the sample suite on a fresh machine and show what came of it"
+	@echo "make demo                     install the sample suite on a fresh machine and show what came of it"
+	@echo "make demo-windows             the same with the wizard; demo-windows-line: with hvdeploy.exe"
+	@echo "make release                  the folder that ships and its archive, in dist"
 	@echo "make test                     every test on both targets"
 	@echo "make test-hosted | test-asan | test-tsan | test-windows"
 	@echo "make bench | format | tidy | setup | clean"
@@ -22,7 +24,19 @@ demo: setup
 	@scripts/demo hosted
 
 demo-windows: setup
+	@scripts/demo wizard
+
+demo-windows-line: setup
 	@scripts/demo windows
+
+release: setup
+	@echo "== Building the preset windows"
+	@cmake --preset windows >/dev/null
+	@cmake --build --preset windows --target hvinstaller hvdeploy
+	@scripts/make-release dist
+
+pictures: setup
+	@scripts/take-pictures
 
 test: test-hosted test-windows
 
