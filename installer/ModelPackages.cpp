@@ -195,12 +195,11 @@ bool InstallerModel::ValidatePackages() {
     const std::set<std::string> releasedNames(names.begin(), names.end());
     std::vector<PackageInfo> good;
     for (const std::string& path : packageFiles) {
-        const std::optional<PackageInfo> info =
-            IsReleased(path, releasedNames) ? ReadPackage(path, hostCheck) : std::nullopt;
+        std::optional<PackageInfo> info = IsReleased(path, releasedNames) ? ReadPackage(path, hostCheck) : std::nullopt;
         if (!info) {
             return false;
         }
-        good.push_back(*info);
+        good.push_back(std::move(*info));
     }
     SortForDisplay(good);
     packages = std::move(good);

@@ -6,6 +6,7 @@
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "hvframework/StringUtils.h"
+#include "installer/WizardBoxes.h"
 #include "installer/WizardToolkit.h"
 
 namespace HV {
@@ -14,7 +15,6 @@ namespace {
 using namespace HVL;
 
 constexpr const char* kLogFileName = "Tessaly Suite Installer.log";
-constexpr unsigned kStopIcon = 16;  // of a beep and of a box, which then has the button OK
 
 std::string PropertyFileOfTheMachine() {
     const std::string company = FileUtils::JoinPath(StringUtils::GetEnvironmentValue("ProgramData"), "Halvorn");
@@ -59,11 +59,11 @@ void RequirePackagesDirectory(WizardToolkit& toolkit) {
     if (FileUtils::DirectoryExists(PackagesDirectoryPath())) {
         return;
     }
-    toolkit.MessageBeep(kStopIcon);
+    toolkit.MessageBeep(kStopBox);
     toolkit.MessageBoxA(nullptr,
                         "This installer application has been moved. It must be run from its original folder "
                         "containing a packages directory. The installer will now exit.",
-                        "Packages Directory Not Found", kStopIcon);
+                        "Packages Directory Not Found", kStopBox);
     toolkit.ExitProcess(0);
 }
 
