@@ -16,7 +16,8 @@ struct ProcessRecord {
 
 /// A snapshot of the running processes that this program may inspect, and two questions about it.
 ///
-/// Only as fresh as the last Refresh(). Not thread-safe: the main thread owns it.
+/// Only as fresh as the last Refresh(), and of the system's list the first 1024 are looked at. Not thread-safe: the
+/// main thread owns it.
 class Processes {
 public:
     /// Takes a first snapshot.
