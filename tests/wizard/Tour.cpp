@@ -2,13 +2,13 @@
 // machine keeps what is installed. HV_WALK_RELEASE names the folder with the release, HV_WALK_PICTURES that for the
 // pictures.
 
+#include "tests/wizard/WizardTest.h"
+
+// It needs what the header above includes.
 #include <psapi.h>
 
-#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
-
-#include "tests/wizard/WizardTest.h"
 
 namespace {
 
