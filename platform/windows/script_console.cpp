@@ -3,8 +3,9 @@
 #include <fcntl.h>
 
 #include <array>
-#include <cstdint>
+#include <cstddef>
 #include <string>
+#include <vector>
 
 namespace platform {
 
@@ -59,15 +60,44 @@ HANDLE NullDevice(SECURITY_ATTRIBUTES& security) {
                          nullptr);
 }
 
-bool HasConsole() {
-    return ::GetConsoleCP() != 0;
-}
-
 void Close(HANDLE& handle) {
     if (handle != nullptr && handle != INVALID_HANDLE_VALUE) {
         ::CloseHandle(handle);
     }
     handle = nullptr;
+}
+
+// Starts it without a window, with these two handles and no other: it must not keep the log of this program open, nor
+// anything else. Gives nothing when that fails.
+PROCESS_INFORMATION StartCommandProcessor(HANDLE input, HANDLE output) {
+    SIZE_T size = 0;
+    ::InitializeProcThreadAttributeList(nullptr, 1, 0, &size);
+    std::vector<std::byte> room(size);
+    auto* const attributes = reinterpret_cast<LPPROC_THREAD_ATTRIBUTE_LIST>(room.data());
+    std::array<HANDLE, 2> handed{input, output};
+    PROCESS_INFORMATION made{};
+    if (::InitializeProcThreadAttributeList(attributes, 1, 0, &size) == FALSE) {
+        return made;
+    }
+    ::UpdateProcThreadAttribute(attributes, 0, PROC_THREAD_ATTRIBUTE_HANDLE_LIST, handed.data(),
+                                handed.size() * sizeof(HANDLE), nullptr, nullptr);
+    STARTUPINFOEXW start{};
+    start.StartupInfo.cb = sizeof start;
+    start.StartupInfo.dwFlags = STARTF_USESTDHANDLES;
+    start.StartupInfo.hStdInput = input;
+    start.StartupInfo.hStdOutput = output;
+    start.StartupInfo.hStdError = output;
+    start.lpAttributeList = attributes;
+    std::wstring line = L"cmd.exe /d /q";
+    ::CreateProcessW(CommandProcessor().c_str(), line.data(), nullptr, nullptr, TRUE,
+                     CREATE_NO_WINDOW | EXTENDED_STARTUPINFO_PRESENT, nullptr, nullptr, &start.StartupInfo, &made);
+    ::DeleteProcThreadAttributeList(attributes);
+    Close(made.hThread);
+    return made;
+}
+
+bool HasConsole() {
+    return ::GetConsoleCP() != 0;
 }
 
 }  // namespace
@@ -101,20 +131,9 @@ void WindowlessConsole::StartBearer() {
     }
     ::SetHandleInformation(input_, HANDLE_FLAG_INHERIT, 0);
     HANDLE nowhere = NullDevice(inherited);
-    STARTUPINFOW start{};
-    start.cb = sizeof start;
-    start.dwFlags = STARTF_USESTDHANDLES;
-    start.hStdInput = itsInput;
-    start.hStdOutput = nowhere;
-    start.hStdError = nowhere;
-    PROCESS_INFORMATION made{};
-    std::wstring line = L"cmd.exe /d /q";
-    if (::CreateProcessW(CommandProcessor().c_str(), line.data(), nullptr, nullptr, TRUE, CREATE_NO_WINDOW, nullptr,
-                         nullptr, &start, &made) != FALSE) {
-        bearer_ = made.hProcess;
-        bearerId_ = made.dwProcessId;
-        Close(made.hThread);
-    }
+    const PROCESS_INFORMATION made = StartCommandProcessor(itsInput, nowhere);
+    bearer_ = made.hProcess;
+    bearerId_ = made.dwProcessId;
     Close(itsInput);
     Close(nowhere);
 }
