@@ -113,6 +113,15 @@ TEST_F(ScriptedModelProcessesTest, AsksForPremiereOnceWhateverNamesIt) {
     EXPECT_EQ(Found(), (Names{"AfterFX.exe", "Adobe Premiere Pro.exe"}));
 }
 
+TEST_F(ScriptedModelProcessesTest, LooksForPremiereAnywhereInAPath) {
+    script.Runs(R"(C:\Old Adobe Premiere Pro.exe of mine\viewer.exe)")
+        .Runs(R"(C:\a\Not Adobe Premiere Pro.exe)")
+        .Runs(R"(C:\a\adobe premiere pro.exe)")
+        .Runs(R"(C:\Adobe Premiere Pro\other.exe)");
+    Uses({"premiere"});
+    EXPECT_EQ(Found(), (Names{"viewer.exe", "Not Adobe Premiere Pro.exe"}));
+}
+
 TEST_F(ScriptedModelProcessesTest, AsksAfreshEachTime) {
     RunsEverything();
     Uses({"aftereffects+premiere"});
