@@ -13,9 +13,6 @@ fail() {
     exit 1
 }
 
-# The checkout's own git, whoever owns the checkout.
-in_git() { git -c safe.directory="$root" -C "$root" "$@"; }
-
 # key TEXT...: a short name for exactly this state of the calling script, this file and the given texts.
 key() {
     { cat "$0" "${BASH_SOURCE[0]}" && printf '%s\n' "$@"; } | sha256sum | cut -c 1-16
