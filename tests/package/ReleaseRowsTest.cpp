@@ -45,4 +45,13 @@ TEST(ReleaseRows, NamesAreComparedExactly) {
     }
 }
 
+TEST(ReleaseRows, AnUnknownNameLeavesTheRecordAlone) {
+    HV::ValidationInfo info{"name", "product", "version", "digest"};
+    HV::GetValidationInfo("com.halvorn.stranger.zip", info);
+    EXPECT_EQ(info.displayName, "name");
+    EXPECT_EQ(info.productId, "product");
+    EXPECT_EQ(info.version, "version");
+    EXPECT_EQ(info.md5, "digest");
+}
+
 }  // namespace

@@ -122,6 +122,7 @@ TEST(HostDisplayName, IsTheProductsNameForAfterEffects) {
 
 TEST(HostDisplayName, TakesAnotherCaseOfAfterEffectsForAnyProgram) {
     EXPECT_EQ(DisplayName("afterfx.exe"), "afterfx");
+    EXPECT_EQ(DisplayName("afterFX.exe"), "afterFX");
     EXPECT_EQ(DisplayName("AfterFX.EXE"), "AfterFX");
 }
 
