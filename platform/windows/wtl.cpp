@@ -25,6 +25,19 @@ bool PressesButton(const MSG& message) {
     return true;
 }
 
+// A text that nobody can write into has no use for Tab and asks for it all the same: the focus would stay there for
+// good.
+bool LeavesText(const MSG& message) {
+    if (message.message != WM_KEYDOWN || message.wParam != VK_TAB ||
+        (::GetWindowLongW(message.hwnd, GWL_STYLE) & ES_READONLY) == 0 ||
+        (::SendMessageW(message.hwnd, WM_GETDLGCODE, VK_TAB, 0) & (DLGC_WANTTAB | DLGC_WANTALLKEYS)) == 0) {
+        return false;
+    }
+    const BOOL backwards = ::GetKeyState(VK_SHIFT) < 0 ? TRUE : FALSE;
+    ::SetFocus(::GetNextDlgTabItem(::GetAncestor(message.hwnd, GA_ROOT), message.hwnd, backwards));
+    return true;
+}
+
 // Required by the flag that asks for a hook. It has nothing to add to what the dialogue does.
 UINT_PTR CALLBACK IdleHook(HWND, UINT, WPARAM, LPARAM) {
     return 0;
@@ -54,7 +67,8 @@ bool CMessageLoop::PreTranslateMessage(MSG& message) {
     if (message.hwnd == nullptr) {
         return false;
     }
-    return PressesButton(message) || ::IsDialogMessageW(::GetAncestor(message.hwnd, GA_ROOT), &message) != FALSE;
+    return PressesButton(message) || LeavesText(message) ||
+           ::IsDialogMessageW(::GetAncestor(message.hwnd, GA_ROOT), &message) != FALSE;
 }
 
 CFileDialog::CFileDialog(const wchar_t* defaultExtension, const wchar_t* fileName, DWORD flags, HWND owner)
