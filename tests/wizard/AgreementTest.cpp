@@ -117,6 +117,28 @@ TEST_F(AgreementTest, SavesTheBytesOfTheDocument) {
     EXPECT_EQ(machine().Content(R"(C:\Kept\Agreement.rtf)"), expected);
 }
 
+TEST_F(AgreementTest, AsksBeforeItReplacesAFile) {
+    HasEveryHost();
+    machine().Has(R"(C:\Kept\Agreement.rtf)", "somebody's own");
+    RunningWizard wizard(folder);
+    const HWND viewer = Open(wizard);
+    wizard.PressForBox(viewer, id::SaveLicense);
+    const Box dialogue = wizard.WaitForBox("Save As");
+    HWND name = nullptr;
+    EXPECT_TRUE(Eventually([&] { return (name = GetDlgItem(dialogue.handle, 1148)) != nullptr; }));
+    EXPECT_TRUE(Eventually([&] { return TextOf(name) == "Halvorn Software License"; })) << TextOf(name);
+    SendMessageA(name, WM_SETTEXT, 0, reinterpret_cast<LPARAM>(R"(C:\Kept\Agreement)"));
+    PostMessageA(GetDlgItem(dialogue.handle, IDOK), BM_CLICK, 0, 0);
+    // The title is the system's, and this is what Wine calls the question.
+    const Box question = wizard.WaitForBox("Error");
+    EXPECT_EQ(question.owner, dialogue.handle);
+    EXPECT_EQ(question.buttons, (std::vector<int>{IDYES, IDNO}));
+    wizard.Answer(question, IDNO);
+    EXPECT_TRUE(Eventually([&] { return IsWindowEnabled(dialogue.handle) != FALSE; }));
+    wizard.Answer(dialogue, IDCANCEL);
+    EXPECT_EQ(machine().Content(R"(C:\Kept\Agreement.rtf)"), "somebody's own");
+}
+
 TEST_F(AgreementTest, WritesNothingWhenSavingIsCancelled) {
     HasEveryHost();
     RunningWizard wizard(folder);
