@@ -1,10 +1,13 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <cstdint>
+#include <cstdlib>
 #include <memory>
 #include <optional>
 
 #include "installer/windows/CustomButton.h"
+#include "installer/windows/SelectionPage.h"
 #include "installer/windows/WizardMetrics.h"
 #include "tests/installer/windows/WindowTest.h"
 
@@ -126,6 +129,9 @@ TEST_F(ButtonTest, HasAnOutlineInTheColourThatIsAskedFor) {
     const Gdiplus::SolidBrush brush(Gdiplus::Color(HV::OpaqueOf(WizardMetrics::FaceColor)));
     HV::FillRoundedRect(graphics, brush, {0, 0, kWidth, kHeight}, 0xFFFF0000);
     EXPECT_GT(canvas.Count(0xFF0000), 150);
+    // One pixel wide: the face begins right behind it.
+    EXPECT_EQ(canvas.At(kWidth / 2, 0), 0xFF0000U);
+    EXPECT_EQ(canvas.At(kWidth / 2, 1), WizardMetrics::FaceColor);
 }
 
 TEST_F(ButtonTest, WritesItsTextInTheTextColour) {
@@ -151,12 +157,43 @@ TEST_F(ButtonTest, CutsItsTextThreePixelsInsideItsEdges) {
     EXPECT_FALSE(canvas.IsFilled({3, 3, kWidth - 3, kHeight - 3}, WizardMetrics::FaceColor));
 }
 
-TEST_F(ButtonTest, RestoresThePageUnit) {
+TEST_F(ButtonTest, FillsPixelsWhateverThePageUnitAndRestoresThat) {
     Gdiplus::Graphics graphics(canvas.Device());
     graphics.SetPageUnit(Gdiplus::UnitPoint);
     const Gdiplus::SolidBrush brush(Gdiplus::Color(0xFFFFFFFF));
-    HV::FillRoundedRect(graphics, brush, {0, 0, kWidth, kHeight}, 0);
+    HV::FillRoundedRect(graphics, brush, {0, 0, 30, 12}, 0);
     EXPECT_EQ(graphics.GetPageUnit(), Gdiplus::UnitPoint);
+    EXPECT_TRUE(canvas.IsFilled({2, 2, 28, 10}, 0xFFFFFF));
+    EXPECT_TRUE(canvas.IsFilled({30, 0, kWidth, kHeight}, 0));
+    EXPECT_TRUE(canvas.IsFilled({0, 12, kWidth, kHeight}, 0));
+}
+
+// Where the next object of the drawing interface finds room. Room that is given back is used again, so only objects
+// that are kept push it on.
+int NextRoom() {
+    const HBRUSH brush = ::CreateSolidBrush(RGB(1, 2, 3));
+    ::DeleteObject(brush);
+    return LOWORD(reinterpret_cast<std::uintptr_t>(brush));
+}
+
+TEST_F(ButtonTest, KeepsNothingOfADrawing) {
+    button.text = "Continue";
+    HV::ProductCheckButton box;
+    box.displayName = "Tessaly Glow";
+    box.background = WizardMetrics::Instance().PageBrush;
+    box.handle = button.handle;
+    const auto drawBoth = [&] {
+        Draw();
+        HV::DrawCheckButton(box, DrawRequest(canvas, box.handle, kPlace));
+    };
+    drawBoth();
+    const int before = NextRoom();
+    int drawings = 0;
+    for (; drawings < 1000; ++drawings) {
+        drawBoth();
+    }
+    EXPECT_EQ(drawings, 1000);
+    EXPECT_LT(std::abs(NextRoom() - before), 500);
 }
 
 // Left, top, right, bottom of what a rounded rectangle at (0, 0) covers.

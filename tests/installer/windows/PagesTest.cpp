@@ -5,6 +5,7 @@
 
 #include "installer/windows/FinalPage.h"
 #include "installer/windows/InstallingPage.h"
+#include "installer/windows/SelectionPage.h"
 #include "installer/windows/WelcomePage.h"
 #include "installer/windows/WizardMetrics.h"
 #include "tests/installer/SetupFolder.h"
@@ -141,6 +142,52 @@ TEST_F(InstallingPageTest, KeepsAFailuresPercent) {
 
 TEST_F(InstallingPageTest, FillsItsBackground) {
     EXPECT_TRUE(FillsItsBackground(page));
+}
+
+/// Counts how often its background is erased.
+class CountingPage : public HV::InstallingPage {
+public:
+    using HV::InstallingPage::InstallingPage;
+
+    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override {
+        erased += message == WM_ERASEBKGND ? 1 : 0;
+        return HV::InstallingPage::ProcessWindowMessage(window, message, wParam, lParam, result);
+    }
+
+    int erased = 0;
+};
+
+TEST_F(PagesTest, InstallingPageErasesWhatItPaintsAgain) {
+    CountingPage page(controller, "Detecting host applications...", 0);
+    ASSERT_NE(page.Create(Parent(), kPage, "", kPageStyle), nullptr);
+    ::UpdateWindow(page);
+    const int before = page.erased;
+    page.SetPercent(50);
+    ::UpdateWindow(page);
+    EXPECT_EQ(page.erased, before + 1);
+    page.SetStatusText("Installing packages...");
+    ::UpdateWindow(page);
+    EXPECT_EQ(page.erased, before + 2);
+    ::DestroyWindow(page);
+}
+
+TEST_F(PagesTest, HaveNoIcon) {
+    HV::WelcomePage welcome(controller);
+    HV::SelectionPage selection(controller);
+    HV::InstallingPage installing(controller, "", 0);
+    HV::FinalPage final(controller);
+    ASSERT_NE(welcome.Create(Parent(), kPage, "", kPageStyle), nullptr);
+    ASSERT_NE(selection.Create(Parent(), kPage, "", kPageStyle), nullptr);
+    ASSERT_NE(installing.Create(Parent(), kPage, "", kPageStyle), nullptr);
+    ASSERT_NE(final.Create(Parent(), kPage, "", kPageStyle), nullptr);
+    int pages = 0;
+    for (const HWND page : {welcome.m_hWnd, selection.m_hWnd, installing.m_hWnd, final.m_hWnd}) {
+        EXPECT_EQ(::GetClassLongPtrW(page, GCLP_HICON), 0U) << pages;
+        EXPECT_EQ(::GetClassLongPtrW(page, GCLP_HICONSM), 0U) << pages;
+        ::DestroyWindow(page);
+        ++pages;
+    }
+    EXPECT_EQ(pages, 4);
 }
 
 TEST_F(PagesTest, FinalPageLeavesItsBackgroundToItsPicture) {

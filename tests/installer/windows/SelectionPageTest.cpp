@@ -175,6 +175,12 @@ TEST_F(SelectionPageTest, CutsATooLongNameInTheControlAlone) {
     EXPECT_EQ(page.CheckButtons().at(0).displayName, name);
 }
 
+TEST_F(SelectionPageTest, HasRoomForANameOf255UnitsInTheControl) {
+    page.AddItem({std::string(255, 'x'), "long", true, true});
+    ASSERT_NE(page.Create(Parent(), kPage, "", WS_CHILD | WS_VISIBLE), nullptr);
+    EXPECT_EQ(ControlsOf(page).back().text, std::wstring(255, L'x'));
+}
+
 TEST_F(SelectionPageTest, GivesControlsTheirNamesFromUtf8) {
     page.AddItem({"Gl\xC3\xBChen", "glow", true, true});
     ASSERT_NE(page.Create(Parent(), kPage, "", WS_CHILD | WS_VISIBLE), nullptr);
