@@ -25,6 +25,8 @@ void WinWizardController::MakeWindow(const std::string& caption, int showCommand
     toolkit_.ShowWindow(WizardPart::MainWindow, showCommand);
 }
 
+// These boxes have no owner, so the window behind them takes presses. Who agrees behind the warning finds the button to
+// read "Install", because the choice of products is looked at only afterwards; that order is kept.
 void WinWizardController::CheckPackagesAndHosts() {
     const InstallerModel& model = InstallerModel::Instance();
     if (!model.valid) {
