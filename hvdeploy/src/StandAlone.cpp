@@ -13,7 +13,7 @@ namespace {
 
 constexpr const char* kUsage =
     "usage: hvdeploy dir=FOLDER | file=PACKAGE | list=hosts|installed  [OPTION...]\n"
-    "  dir=FOLDER       install the packages of a folder (default: the folder \"packages\" nearby)\n"
+    "  dir=FOLDER       install the packages of a folder (default: the folder \"packages\" in the current folder)\n"
     "  file=PACKAGE     install one package\n"
     "  skip=NAME,...    leave these packages out (product identifier or file name)\n"
     "  log=FILE         write the log to FILE, besides standard output\n"

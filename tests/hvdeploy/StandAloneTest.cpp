@@ -7,6 +7,7 @@
 #include <sstream>
 
 #include "hvdeploy/src/ProgressBar.h"
+#include "platform/filesystem.h"
 #include "tests/hvdeploy/TerminalPicture.h"
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
@@ -66,6 +67,7 @@ TEST(StandAlone, ExplainsItselfWithoutArguments) {
         ++named;
     }
     EXPECT_EQ(named, 12);
+    EXPECT_NE(result.errors.find("(default: the folder \"packages\" in the current folder)\n"), std::string::npos);
     EXPECT_TRUE(machine.TempEntries().empty());
 }
 
@@ -101,6 +103,44 @@ TEST(StandAlone, InstallsFromAFolderWithABlankInItsName) {
     const ProgramResult result = RunProgram("hvdeploy", {R"(dir=C:\My Packages)"});
     EXPECT_EQ(result.exitStatus, 0) << result.output;
     EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn\Glow.txt)"), "new");
+}
+
+/// Makes a folder of the machine the current one, which programs inherit, for as long as this object lives.
+class WorkingIn {
+public:
+    explicit WorkingIn(const std::string& folder) : before_(fs::current_path()) { fs::current_path(fs::path(folder)); }
+    ~WorkingIn() {
+        boost::system::error_code error;
+        fs::current_path(before_, error);
+        EXPECT_FALSE(error) << error.message();
+    }
+    WorkingIn(const WorkingIn&) = delete;
+    WorkingIn& operator=(const WorkingIn&) = delete;
+
+private:
+    fs::path before_;
+};
+
+TEST(StandAlone, InstallsThePackagesOfTheCurrentFolderWhenNoneAreNamed) {
+    Machine machine;
+    (void)Glow().WriteTo(R"(C:\Here\packages)");
+    const WorkingIn here(R"(C:\Here)");
+    const ProgramResult result = RunProgram("hvdeploy", {"loglevel=info"});
+    EXPECT_EQ(result.exitStatus, 0) << result.output;
+    EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn\Glow.txt)"), "new");
+}
+
+TEST(StandAlone, StartedFromAnotherFolderDoesNotSeeThePackagesBesideTheProgram) {
+    Machine machine;
+    machine.HasFolder(R"(C:\Elsewhere)");
+    ASSERT_TRUE(fs::is_directory(fs::path("Z:" HV_PROGRAM_FOLDER "/packages")));
+    const auto before = machine.Files();
+    const WorkingIn elsewhere(R"(C:\Elsewhere)");
+    const ProgramResult result = RunProgram("hvdeploy", {"loglevel=info"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.errors, "");
+    EXPECT_NE(result.output.find(" INFO hvdeploy-detail : No files to install.\n"), std::string::npos) << result.output;
+    EXPECT_EQ(machine.Files(), before);
 }
 
 TEST(StandAlone, ShowsNoBarWhereNobodyWatches) {
