@@ -161,6 +161,70 @@ TEST_F(HvpackTest, ChecksSoundPackagesWithStatusZero) {
     EXPECT_EQ(err, "");
 }
 
+/// A package with one payload for hosts and one for a system directory, which a test spoils.
+class DoubtfulPackageTest : public HvpackTest {
+protected:
+    DoubtfulPackageTest() {
+        description.Payload("plugin").Id("effect").File("Glow.aex", "bytes").Subpath("Halvorn/Glow");
+    }
+    /// What `check` says, behind the words that each warning begins with.
+    std::string Doubt() {
+        (void)description.Named("glow.hvpkg").WriteTo(R"(C:\out)");
+        EXPECT_EQ(Run({"check", R"(C:\out\glow.hvpkg)"}), 0) << err;
+        EXPECT_EQ(out, "OK C:\\out\\glow.hvpkg\n");
+        const std::string start = R"(hvpack: WARNING: C:\out\glow.hvpkg: )";
+        return err.rfind(start, 0) == 0 ? err.substr(start.size()) : err;
+    }
+
+    PackageBuilder description{"com.halvorn.glow"};
+};
+
+TEST_F(DoubtfulPackageTest, HasNoDoubtsWhenEveryWordIsKnown) {
+    int known = 0;
+    for (const char* host : {"aftereffects", "aftereffectsMC", "aftereffects+premiere", "premiere", "edius", "hitfilm",
+                             "mediacomposer", "resolve", "vegas", "ofx", "finalcutprox", "motion"}) {
+        description.ForHost(host);
+        ++known;
+    }
+    description.Payload("help").To("commondocs", "Halvorn...").File("Read me.txt", "text");
+    EXPECT_EQ(Doubt(), "");
+    EXPECT_EQ(known, 12);
+}
+
+TEST_F(DoubtfulPackageTest, WarnsOfAnUnknownType) {
+    description.Payload("Library").Id("core").To("programdata").File("Core.dll", "bytes");
+    EXPECT_EQ(Doubt(), "payload core has an unknown type\n");
+}
+
+TEST_F(DoubtfulPackageTest, WarnsOfAnUnknownHost) {
+    description.ForHost("resolve").ForHost("After Effects");
+    EXPECT_EQ(Doubt(), "payload effect has the unknown host-ref \"After Effects\"\n");
+}
+
+TEST_F(DoubtfulPackageTest, WarnsOfAnUnknownSystemDirectory) {
+    description.Payload("help").Id("manual").To("CommonDocs").File("Read me.txt", "text");
+    EXPECT_EQ(Doubt(), "payload manual has the unknown sysdir \"CommonDocs\"\n");
+}
+
+TEST_F(DoubtfulPackageTest, WarnsOfASubpathThatLeavesItsFolder) {
+    description.Subpath("Halvorn/../../Other");
+    EXPECT_EQ(Doubt(), "payload effect leaves its folder: \"..\" stands in its subpath\n");
+}
+
+TEST_F(DoubtfulPackageTest, PassesOverPayloadsForOtherSystems) {
+    description.Payload("Bundle").Os("mac").To("nowhere", "../..").ForHost("nobody").File("Glow.plugin", "bytes");
+    EXPECT_EQ(Doubt(), "");
+}
+
+TEST_F(DoubtfulPackageTest, IsMadeAllTheSameWithAWarning) {
+    description.ForHost("premier");
+    machine.Has(R"(C:\doubtful\_hvmanifest.xml)", description.Manifest());
+    machine.Has(R"(C:\doubtful\Glow.aex)", "bytes");
+    EXPECT_EQ(Run({"make", R"(C:\doubtful)", R"(C:\glow.hvpkg)"}), 0);
+    EXPECT_EQ(out, "OK C:\\glow.hvpkg\n");
+    EXPECT_EQ(err, "hvpack: WARNING: C:\\glow.hvpkg: payload effect has the unknown host-ref \"premier\"\n");
+}
+
 TEST_F(HvpackTest, DoesNotListWhatIsNoPackage) {
     machine.Has(R"(C:\out\bad.zip)", "garbage");
     EXPECT_EQ(Run({"list", R"(C:\out\bad.zip)"}), 1);

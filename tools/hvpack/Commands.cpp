@@ -7,6 +7,7 @@
 
 #include "hvframework/Log.h"
 #include "package/ZipEntries.h"
+#include "tools/hvpack/Doubts.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/PackageMaker.h"
 #include "tools/hvpack/ReleaseTable.h"
@@ -64,16 +65,23 @@ bool Report(std::ostream& err, Step step) {
     }
 }
 
+/// Warns of what the engine takes without a word. The exit status does not know of it.
+void Warn(const HV::Manifest& manifest, const std::string& file, std::ostream& err) {
+    for (const std::string& doubt : DoubtsAbout(manifest)) {
+        err << "hvpack: WARNING: " << file << ": " << doubt << '\n';
+    }
+}
+
 bool Make(const Arguments& arguments, std::ostream& out, std::ostream& err) {
     return Report(err, [&] {
-        MakePackage(fs::path(arguments[1]), fs::path(arguments[2]));
+        Warn(MakePackage(fs::path(arguments[1]), fs::path(arguments[2])), arguments[2], err);
         out << "OK " << arguments[2] << '\n';
         return true;
     });
 }
 
-bool CheckOne(const std::string& file, std::ostream& out) {
-    (void)SoundPackage(file);
+bool CheckOne(const std::string& file, std::ostream& out, std::ostream& err) {
+    Warn(SoundPackage(file).manifest, file, err);
     out << "OK " << file << '\n';
     return true;
 }
@@ -81,7 +89,7 @@ bool CheckOne(const std::string& file, std::ostream& out) {
 bool Check(const Arguments& arguments, std::ostream& out, std::ostream& err) {
     bool sound = true;
     for (std::size_t file = 1; file < arguments.size(); ++file) {
-        sound &= Report(err, [&] { return CheckOne(arguments[file], out); });
+        sound &= Report(err, [&] { return CheckOne(arguments[file], out, err); });
     }
     return sound;
 }

@@ -3,6 +3,7 @@
 #include <minizip/zip.h>
 
 #include <algorithm>
+#include <utility>
 #include <vector>
 
 #include "hvframework/FileUtils.h"
@@ -185,26 +186,28 @@ void RefuseOutputInside(const fs::path& folder, const fs::path& output) {
     }
 }
 
-void WriteAndCheck(const std::vector<Item>& items, const fs::path& output) {
+HV::Manifest WriteAndCheck(const std::vector<Item>& items, const fs::path& output) {
     const WorkFolder work(output.parent_path() / (output.filename().string() + ".part"));
     const fs::path unfinished = work.Path() / output.filename();
     WriteArchive(items, unfinished);
-    if (!HV::Package(unfinished).Validate(false)) {
+    HV::Package package(unfinished);
+    if (!package.Validate(false)) {
         throw PackageError(output.filename().string() + " would not be a sound package");
     }
     fs::rename(unfinished, output);
+    return std::move(package.manifest);
 }
 
 }  // namespace
 
-void MakePackage(const fs::path& folder, const fs::path& output) {
+HV::Manifest MakePackage(const fs::path& folder, const fs::path& output) {
     try {
         RefuseUnlessNamedAsPackage(output);
         if (!fs::is_directory(folder)) {
             throw PackageError(folder.string() + " is not a folder");
         }
         RefuseOutputInside(folder, output);
-        WriteAndCheck(SortedItems(folder), output);
+        return WriteAndCheck(SortedItems(folder), output);
     } catch (const fs::filesystem_error& error) {
         throw PackageError(error.what());
     }
