@@ -121,16 +121,19 @@ std::vector<HWND> RunningWizard::TopWindows() const {
     return search.found;
 }
 
+bool RunningWizard::HasWindow() {
+    if (window_ == nullptr) {
+        for (const HWND window : TopWindows()) {
+            if (GetDlgItem(window, 1124) != nullptr) {
+                window_ = window;
+            }
+        }
+    }
+    return window_ != nullptr;
+}
+
 HWND RunningWizard::Window() {
-    const bool found = window_ != nullptr || Eventually([this] {
-                           for (const HWND window : TopWindows()) {
-                               if (GetDlgItem(window, 1124) != nullptr) {
-                                   window_ = window;
-                               }
-                           }
-                           return window_ != nullptr;
-                       });
-    EXPECT_TRUE(found) << "the main window does not come";
+    EXPECT_TRUE(Eventually([this] { return HasWindow(); })) << "the main window does not come";
     return window_;
 }
 
@@ -217,6 +220,15 @@ void RunningWizard::CloseFromTitleBar(HWND window) {
 bool RunningWizard::HasBox() const {
     const std::vector<HWND> windows = TopWindows();
     return std::any_of(windows.begin(), windows.end(), [](HWND window) { return ClassOf(window) == "#32770"; });
+}
+
+std::string RunningWizard::TextOfBox() const {
+    for (const HWND window : TopWindows()) {
+        if (ClassOf(window) == "#32770") {
+            return TextOf(window) + ": " + TextOf(GetDlgItem(window, kBoxText));
+        }
+    }
+    return "";
 }
 
 Box RunningWizard::WaitForBox(const std::string& title) {

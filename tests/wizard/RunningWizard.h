@@ -49,6 +49,8 @@ public:
 
     /// The main window, once it is to be seen. It is the one with the buttons.
     HWND Window();
+    /// Whether it is to be seen already.
+    [[nodiscard]] bool HasWindow();
     /// The page that is visible now; null between two pages.
     [[nodiscard]] HWND Page();
     /// Waits for a visible page that has, or has not, a control of this identifier.
@@ -77,6 +79,8 @@ public:
     /// A box with one button.
     void AnswerOk(const Box& box);
     [[nodiscard]] bool HasBox() const;
+    /// What the modal box says that is open now; empty when there is none.
+    [[nodiscard]] std::string TextOfBox() const;
 
     /// Whether the client area comes to show all of these, and, when not, which ones it does not.
     testing::AssertionResult Shows(HWND window, const std::vector<look::Mark>& marks);
