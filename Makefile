@@ -10,12 +10,20 @@ export CCACHE_NOHASHDIR := 1
 .PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench format tidy clean
 
 help:
-	@echo "make demo                     install the sample suite on a fresh machine and show what came of it"
-	@echo "make demo-windows             the same with the wizard; demo-windows-line: with hvdeploy.exe"
-	@echo "make release                  the folder that ships and its archive, in dist"
-	@echo "make test                     every test on both targets"
-	@echo "make test-hosted | test-asan | test-tsan | test-windows"
-	@echo "make bench | format | tidy | setup | clean"
+	@echo "make demo                install the sample suite on a fresh machine and show what came of it"
+	@echo "make demo-windows        the same with the wizard under Wine"
+	@echo "make demo-windows-line   the same with hvdeploy.exe under Wine"
+	@echo "make release             the folder that ships and its archive, in dist"
+	@echo "make release SUITE=DIR   the same of your own packages; see docs/releasing.md"
+	@echo "make pictures            the wizard's pictures in docs/images, taken again"
+	@echo "make test                every test on both targets"
+	@echo "make test-hosted         the tests of one target; also: test-windows"
+	@echo "make test-asan           the hosted tests under sanitizers; also: test-tsan"
+	@echo "make bench               speed and memory, against standard tools"
+	@echo "make format              apply .clang-format"
+	@echo "make tidy                run clang-tidy"
+	@echo "make setup               install what is missing, and nothing else"
+	@echo "make clean               remove build and dist"
 
 setup:
 	@scripts/setup
@@ -29,11 +37,14 @@ demo-windows: setup
 demo-windows-line: setup
 	@scripts/demo windows
 
+# Another suite has a build of its own: the tests look at the sample.
+RELEASE_BUILD := build/$(if $(SUITE),suite,windows)
+
 release: setup
-	@echo "== Building the preset windows"
-	@cmake --preset windows >/dev/null
-	@cmake --build --preset windows --target hvinstaller hvdeploy
-	@scripts/make-release dist
+	@echo "== Building the programs of the release in $(RELEASE_BUILD)"
+	@cmake --preset windows -B $(RELEASE_BUILD) $(if $(SUITE),-D "HV_SUITE=$(SUITE)") >/dev/null
+	@cmake --build $(RELEASE_BUILD) --target hvinstaller hvdeploy
+	@scripts/make-release dist $(RELEASE_BUILD)
 
 pictures: setup
 	@scripts/take-pictures

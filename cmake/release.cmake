@@ -26,11 +26,13 @@ else()
     set(HV_PACKER_DEPENDS hvpack)
 endif()
 
-# hv_sample_release(PACKAGES_VARIABLE folder): packs samples/tessaly-suite into `folder`, which is replaced whole, and
-# sets the variable to the files that come to lie there.
-function(hv_sample_release files_variable folder)
+# hv_release(PACKAGES_VARIABLE SUITE folder): packs the sources in SUITE into `folder`, which is replaced whole, and sets
+# the variable to the files that come to lie there.
+function(hv_release files_variable suite folder)
+    if(NOT EXISTS ${suite}/suite.json)
+        message(FATAL_ERROR "There is no suite.json in ${suite}: the sources of a release are a folder for each package, and suite.json")
+    endif()
     set(script ${CMAKE_SOURCE_DIR}/scripts/make-sample-release)
-    set(suite ${CMAKE_SOURCE_DIR}/samples/tessaly-suite)
     file(GLOB_RECURSE sources CONFIGURE_DEPENDS ${suite}/*)
     file(GLOB manifests CONFIGURE_DEPENDS ${suite}/*/_hvmanifest.xml)
     set(files ${folder}/suite.json)
@@ -39,11 +41,14 @@ function(hv_sample_release files_variable folder)
         cmake_path(GET package FILENAME package)
         list(APPEND files ${folder}/${package}.zip)
     endforeach()
+    # A source that is taken away makes no other one newer; it changes this list.
+    set(list ${CMAKE_CURRENT_BINARY_DIR}/sources.txt)
+    file(CONFIGURE OUTPUT ${list} CONTENT "${sources}" @ONLY)
     add_custom_command(
         OUTPUT ${files}
-        COMMAND ${script} ${folder} ${HV_PACKER}
-        DEPENDS ${sources} ${script} ${HV_PACKER_DEPENDS}
-        COMMENT "Packing the sample release"
+        COMMAND ${script} ${folder} ${HV_PACKER} ${suite}
+        DEPENDS ${sources} ${list} ${script} ${HV_PACKER_DEPENDS}
+        COMMENT "Packing the release"
         VERBATIM
     )
     set(${files_variable} ${files} PARENT_SCOPE)
