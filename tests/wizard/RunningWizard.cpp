@@ -68,6 +68,29 @@ RECT InParent(HWND window) {
     return part;
 }
 
+namespace {
+
+Box ReadBox(HWND handle) {
+    Box box;
+    box.handle = handle;
+    box.title = TextOf(box.handle);
+    box.text = TextOf(GetDlgItem(box.handle, kBoxText));
+    box.owner = GetWindow(box.handle, GW_OWNER);
+    for (const HWND child : ChildrenOf(box.handle)) {
+        if (ClassOf(child) == "Button" && IsWindowVisible(child)) {
+            box.buttons.push_back(GetDlgCtrlID(child));
+        }
+        DWORD_PTR icon = 0;
+        if (ClassOf(child) == "Static" && SendMessageTimeoutA(child, STM_GETICON, 0, 0, SMTO_NORMAL, kMinute, &icon)) {
+            box.hasIcon = box.hasIcon || icon != 0;
+        }
+    }
+    std::sort(box.buttons.begin(), box.buttons.end());
+    return box;
+}
+
+}  // namespace
+
 RunningWizard::RunningWizard(const std::string& folder) {
     STARTUPINFOA start{};
     start.cb = sizeof start;
@@ -222,40 +245,27 @@ bool RunningWizard::HasBox() const {
     return std::any_of(windows.begin(), windows.end(), [](HWND window) { return ClassOf(window) == "#32770"; });
 }
 
-std::string RunningWizard::TextOfBox() const {
+std::optional<Box> RunningWizard::OpenBox() const {
     for (const HWND window : TopWindows()) {
         if (ClassOf(window) == "#32770") {
-            return TextOf(window) + ": " + TextOf(GetDlgItem(window, kBoxText));
+            return ReadBox(window);
         }
     }
-    return "";
+    return std::nullopt;
 }
 
 Box RunningWizard::WaitForBox(const std::string& title) {
-    Box box;
+    HWND handle = nullptr;
     EXPECT_TRUE(Eventually([&] {
         for (const HWND window : TopWindows()) {
             if (ClassOf(window) == "#32770" && TextOf(window) == title) {
-                box.handle = window;
+                handle = window;
             }
         }
-        return box.handle != nullptr;
+        return handle != nullptr;
     })) << "no box \""
         << title << "\"";
-    box.title = TextOf(box.handle);
-    box.text = TextOf(GetDlgItem(box.handle, kBoxText));
-    box.owner = GetWindow(box.handle, GW_OWNER);
-    for (const HWND child : ChildrenOf(box.handle)) {
-        if (ClassOf(child) == "Button" && IsWindowVisible(child)) {
-            box.buttons.push_back(GetDlgCtrlID(child));
-        }
-        DWORD_PTR icon = 0;
-        if (ClassOf(child) == "Static" && SendMessageTimeoutA(child, STM_GETICON, 0, 0, SMTO_NORMAL, kMinute, &icon)) {
-            box.hasIcon = box.hasIcon || icon != 0;
-        }
-    }
-    std::sort(box.buttons.begin(), box.buttons.end());
-    return box;
+    return ReadBox(handle);
 }
 
 void RunningWizard::Answer(const Box& box, int button) {

@@ -79,8 +79,8 @@ public:
     /// A box with one button.
     void AnswerOk(const Box& box);
     [[nodiscard]] bool HasBox() const;
-    /// What the modal box says that is open now; empty when there is none.
-    [[nodiscard]] std::string TextOfBox() const;
+    /// The modal box that is open now, whatever its title is.
+    [[nodiscard]] std::optional<Box> OpenBox() const;
 
     /// Whether the client area comes to show all of these, and, when not, which ones it does not.
     testing::AssertionResult Shows(HWND window, const std::vector<look::Mark>& marks);
