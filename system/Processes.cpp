@@ -21,6 +21,7 @@ std::string ProgramOf(HANDLE process) {
     HMODULE program = nullptr;
     DWORD needed = 0;
     // A process has many modules, and the program is the first.
+    // NOLINTNEXTLINE(bugprone-sizeof-expression): a module's handle is a pointer.
     if (!K32EnumProcessModules(process, &program, sizeof program, &needed)) {
         return {};
     }

@@ -114,8 +114,9 @@ BOOL K32EnumProcessModules(HANDLE process, PHMODULE modules, DWORD size, LPDWORD
     if (NumberOf(process, HandleKind::Process) < 0) {
         return Refuse(ERROR_INVALID_HANDLE);
     }
-    *needed = sizeof(HMODULE);
-    if (size >= sizeof(HMODULE)) {
+    constexpr DWORD kOneModule = sizeof(HMODULE);  // NOLINT(bugprone-sizeof-expression): a handle is a pointer.
+    *needed = kOneModule;
+    if (size >= kOneModule) {
         *modules = reinterpret_cast<HMODULE>(process);
     }
     return TRUE;

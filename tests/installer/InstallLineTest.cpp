@@ -69,8 +69,7 @@ TEST_F(InstallLineReading, TakesTheFolderAsItIsCalled) {
         R"(C:\a 'quoted folder' here\packages)",
         R"(C:\dir=C:\packages)",
         R"(C:\--verbose & (x86) %Temp% ; ^!\packages)",
-        "C:\\\xC3\x9C"
-        "bung \xE6\x97\xA5\xE6\x9C\xAC\\packages",
+        std::string("C:\\\xC3\x9C") + "bung \xE6\x97\xA5\xE6\x9C\xAC\\packages",
         R"(C:\  two  blanks  \packages)",
         "D:\\packages",
     };

@@ -15,8 +15,6 @@ std::string HV::ProgramPath() {
 
 namespace {
 
-using HV::WizardState;
-
 class ReleaseWizard : public WizardWalk {
 protected:
     ReleaseWizard() { EXPECT_EQ(HVL::FileUtils::CopyFileOrDirectory(HV_RELEASE_PACKAGES, PackagesFolder()), 0); }

@@ -121,7 +121,7 @@ TEST_F(ScanTest, ATextThatIsNoJsonObjectIsRefused) {
         "\xEF\xBB\xBF{\"display_name\": \"behind a byte-order mark\"}",
         "{\"number\": 1e999}",
         "{\"installed_file_paths\": [1]}",
-        std::string(10'000'000, '['),
+        std::string(10'000'000, '['),  // NOLINT(bugprone-string-constructor): ten megabytes are meant.
     };
     std::size_t refused = 0;
     for (const std::string& json : bad) {
@@ -136,6 +136,7 @@ TEST_F(ScanTest, ATextThatIsNoJsonObjectIsRefused) {
 
 TEST_F(ScanTest, ASuiteFileOfTenMegabytesIsRead) {
     setup.Ships(Product("glow"));
+    // NOLINTNEXTLINE(bugprone-string-constructor): ten megabytes are meant.
     setup.HasSuite("{\"filler\": \"" + std::string(10'000'000, 'x') + "\", \"display_name\": \"Large Suite\"}");
     const HV::InstallerModel& model = Load();
     EXPECT_TRUE(model.valid);

@@ -126,7 +126,7 @@ PVOID FreeGroup(PSID sid) {
 
 // The operation under test, with the system's answers replaced.
 #define CreateSharedDirectory CreateScriptedDirectory
-#include "installer/SharedDirectory.cpp"
+#include "installer/SharedDirectory.cpp"  // NOLINT(bugprone-suspicious-include): its calls are to be replaced.
 
 namespace {
 
