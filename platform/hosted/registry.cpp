@@ -193,7 +193,7 @@ std::int32_t Registry::CreateKey(Handle parent, std::string_view subKey, std::ui
     if (!subKey.empty() && subKey[0] == '\\') {
         return ERROR_BAD_PATHNAME;
     }
-    if (HasBadName(subKey)) {
+    if (HasBadName(subKey) || CountNames(from->Path()) + CountNames(subKey) > DeepestKey) {
         return ERROR_INVALID_PARAMETER;
     }
     KeyPointer key = Find(from, subKey);

@@ -18,6 +18,13 @@ constexpr std::size_t HexLineLength = 72;
 constexpr std::array<std::string_view, 5> HiveNames = {"HKEY_CLASSES_ROOT", "HKEY_CURRENT_USER", "HKEY_LOCAL_MACHINE",
                                                        "HKEY_USERS", "HKEY_CURRENT_CONFIG"};
 
+/// Two hives are views of keys elsewhere, which lie up to so much deeper.
+constexpr std::size_t LevelsBehindView = 4;
+
+bool IsView(std::string_view hive) {
+    return hive == "HKEY_CLASSES_ROOT" || hive == "HKEY_CURRENT_CONFIG";
+}
+
 std::string_view TrimBlanks(std::string_view text) {
     const std::size_t first = text.find_first_not_of(" \t");
     if (first == std::string_view::npos) {
@@ -101,6 +108,9 @@ private:
             if (hive == name) {
                 if (deletes && hive.size() == key_.size()) {
                     Fail("a hive cannot be deleted");
+                }
+                if (CountNames(key_) + (IsView(hive) ? LevelsBehindView : 0) > DeepestKey) {
+                    Fail("a key that lies too deep");
                 }
                 return;
             }
@@ -329,6 +339,16 @@ std::string DataText(std::uint32_t type, std::string_view data) {
 }
 
 }  // namespace
+
+std::size_t CountNames(std::string_view path) {
+    std::size_t names = 0;
+    bool inName = false;
+    for (const char c : path) {
+        names += !inName && c != '\\' ? 1 : 0;
+        inName = c != '\\';
+    }
+    return names;
+}
 
 std::vector<RegistryChange> ParseRegistryText(std::string_view text) {
     return Parser(text).Parse();

@@ -33,6 +33,12 @@ private:
     std::size_t line_;
 };
 
+/// How deep keys may nest, the hive counted, as on Windows.
+inline constexpr std::size_t DeepestKey = 512;
+
+/// How many names a key's path is made of; empty ones between separators do not count.
+std::size_t CountNames(std::string_view path);
+
 /// The changes that `text` asks for, in their order. Throws RegistryTextError.
 std::vector<RegistryChange> ParseRegistryText(std::string_view text);
 

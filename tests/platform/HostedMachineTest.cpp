@@ -296,6 +296,24 @@ TEST_F(HostedRegistryTest, RefusesNamesThatTextCannotHold) {
               ERROR_INVALID_PARAMETER);
 }
 
+// What is made must be text that can be read again.
+TEST_F(HostedRegistryTest, RefusesAKeyThatLiesTooDeep) {
+    std::string deep;
+    for (int i = 0; i < 508; ++i) {
+        deep += "k\\";
+    }
+    HKEY made = nullptr;
+    const auto create = [&made](HKEY parent, const std::string& path) {
+        return RegCreateKeyExA(parent, path.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS, nullptr, &made, nullptr);
+    };
+    // Two names and the hive are above it.
+    ASSERT_EQ(create(HKEY_CLASSES_ROOT, deep + "k"), ERROR_SUCCESS);
+    EXPECT_EQ(create(made, "k"), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(create(HKEY_CLASSES_ROOT, deep + "x\\x"), ERROR_INVALID_PARAMETER);
+    Current().GetRegistry().Reload();
+    EXPECT_EQ(create(HKEY_CLASSES_ROOT, deep + "k"), ERROR_SUCCESS);
+}
+
 TEST_F(HostedRegistryTest, FailsOnDemandAndChangesNothing) {
     Set(R"(SOFTWARE\Halvorn)", "a", "1");
     const std::string before = Registry().Text();

@@ -133,6 +133,31 @@ TEST(RegistryText, RefusesAValueWithoutAKey) {
     EXPECT_EQ(LineOfError("REGEDIT4\n[-HKEY_CURRENT_USER\\x]\n\"a\"=\"b\"\n"), 3u);
 }
 
+/// The line of a key with so many names, that of the hive among them.
+std::string DeepKey(const std::string& hive, std::size_t names) {
+    std::string path = hive;
+    for (std::size_t i = 1; i < names; ++i) {
+        path += "\\k";
+    }
+    return "[" + path + "]\n";
+}
+
+TEST(RegistryText, RefusesAKeyThatLiesTooDeep) {
+    EXPECT_EQ(Parse(DeepKey("HKEY_CURRENT_USER", 512)).size(), 1u);
+    EXPECT_EQ(LineOfError("REGEDIT4\n" + DeepKey("HKEY_CURRENT_USER", 513)), 2u);
+    EXPECT_EQ(LineOfError("REGEDIT4\n" + DeepKey("HKEY_CURRENT_USER", 200000)), 2u);
+}
+
+TEST(RegistryText, LeavesRoomForWhereAViewsKeysReallyLie) {
+    std::size_t ran = 0;
+    for (const std::string hive : {"HKEY_CLASSES_ROOT", "HKEY_CURRENT_CONFIG"}) {
+        EXPECT_EQ(Parse(DeepKey(hive, 508)).size(), 1u) << hive;
+        EXPECT_EQ(LineOfError("REGEDIT4\n" + DeepKey(hive, 509)), 2u) << hive;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 2u);
+}
+
 TEST(RegistryText, ReadsBackWhatItWrites) {
     const std::vector<std::pair<std::uint32_t, std::string>> values = {{1, std::string("plain\0", 6)},
                                                                        {1, std::string("C:\\a \"b\"\0", 9)},
