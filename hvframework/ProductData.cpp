@@ -26,6 +26,32 @@ bool ReadBool(const std::string& value) {
     return !value.empty() && std::string_view("tT1").find(value.front()) != std::string_view::npos;
 }
 
+// The library allows arrays this depth, and forgets to count objects.
+constexpr std::size_t kDeepestValue = 100;
+
+/// Whether the value at the start of `json` nests too deep for the library, which reads and frees values by recursion:
+/// a file of some megabytes would leave it without a stack.
+bool NestsTooDeep(const std::string& json) {
+    std::size_t depth = 0;
+    bool inText = false;
+    for (std::size_t at = 0; at < json.size(); ++at) {
+        const char c = json[at];
+        if (inText) {
+            at += c == '\\' ? 1 : 0;
+            inText = c != '"';
+        } else if (c == '"') {
+            inText = true;
+        } else if (c == '{' || c == '[') {
+            if (++depth > kDeepestValue) {
+                return true;
+            }
+        } else if ((c == '}' || c == ']') && depth-- <= 1) {
+            return false;
+        }
+    }
+    return false;
+}
+
 }  // namespace
 
 bool ProductData::operator<(const ProductData& other) const {
@@ -40,7 +66,7 @@ bool ProductData::operator<(const ProductData& other) const {
 
 bool ProductData::ReadJSON(const std::string& json) {
     picojson::value document;
-    if (!picojson::parse(document, json).empty()) {
+    if (NestsTooDeep(json) || !picojson::parse(document, json).empty()) {
         return false;
     }
     // The accessors throw on a value of another kind; the caller deals with that.

@@ -17,9 +17,9 @@ public:
     virtual bool operator<(const ProductData& other) const;
 
     /// Adds the members of the JSON object `json` to the record, which is not cleared first. Members that are neither
-    /// strings nor the array "installed_file_paths" are passed over. Returns false on a syntax error, with the record
-    /// as it was. Throws std::runtime_error when the text is JSON but no object, when a path in that array is no
-    /// string, and for a number that no double can hold.
+    /// strings nor the array "installed_file_paths" are passed over. Returns false on a syntax error, or when values
+    /// nest more than a hundred deep, with the record as it was. Throws std::runtime_error when the text is JSON but no
+    /// object, when a path in that array is no string, and for a number that no double can hold.
     [[nodiscard]] bool ReadJSON(const std::string& json);
 
     /// Stores `value` in the key's own field, or in `values`. The paths of "installed_file_paths" come only through

@@ -85,6 +85,39 @@ TEST(ProductData, RefusesASyntaxErrorAndStaysAsItWas) {
     EXPECT_EQ(product.GetDisplayName(), "Glow");
 }
 
+std::string Repeated(const std::string& text, std::size_t times) {
+    std::string all;
+    for (std::size_t i = 0; i < times; ++i) {
+        all += text;
+    }
+    return all;
+}
+
+/// An object with this many objects in each other.
+std::string Nested(std::size_t depth) {
+    return Repeated(R"({"a":)", depth) + "0" + Repeated("}", depth);
+}
+
+TEST(ProductData, ReadsAHundredValuesInEachOtherAndRefusesMore) {
+    ProductData product;
+    EXPECT_TRUE(product.ReadJSON(Nested(100)));
+    EXPECT_FALSE(product.ReadJSON(Nested(101)));
+    EXPECT_FALSE(product.ReadJSON(Repeated("[", 101) + Repeated("]", 101)));
+}
+
+TEST(ProductData, SurvivesObjectsThatNestWithoutEnd) {
+    ProductData product = Product("Glow", "com.halvorn.glow", "1.0");
+    EXPECT_FALSE(product.ReadJSON(Nested(300000)));
+    EXPECT_FALSE(product.ReadJSON(Repeated(R"({"a\\":)", 300000)));
+    EXPECT_EQ(product.GetIdentifier(), "com.halvorn.glow");
+}
+
+TEST(ProductData, TakesNoBracketInATextForAValue) {
+    ProductData product;
+    EXPECT_TRUE(product.ReadJSON(R"({"display_name": "\"{)" + Repeated("[{", 200) + R"("})"));
+    EXPECT_EQ(product.GetDisplayName(), "\"{" + Repeated("[{", 200));
+}
+
 TEST(ProductData, ThrowsWhenTheTextIsNoObject) {
     ProductData product;
     int cases = 0;
