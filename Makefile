@@ -7,7 +7,7 @@ SHELL := /bin/bash
 export CCACHE_BASEDIR := $(CURDIR)
 export CCACHE_NOHASHDIR := 1
 
-.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench format tidy clean
+.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench fuzz format tidy clean
 
 help:
 	@echo "make demo                install the sample suite on a fresh machine and show what came of it"
@@ -20,6 +20,7 @@ help:
 	@echo "make test-hosted         the tests of one target; also: test-windows"
 	@echo "make test-asan           the hosted tests under sanitizers; also: test-tsan"
 	@echo "make bench               speed and memory, against standard tools"
+	@echo "make fuzz                bytes that crash, stall or bloat a reader; FUZZ_SECONDS=30"
 	@echo "make format              apply .clang-format"
 	@echo "make tidy                run clang-tidy"
 	@echo "make setup               install what is missing, and nothing else"
@@ -74,11 +75,17 @@ $(PRESETS:%=test-on-%): test-on-%: build-%
 bench: build-hosted
 	@bench/run
 
+fuzz: setup
+	@echo "== Building the preset fuzz"
+	@cmake --preset fuzz >/dev/null
+	@cmake --build --preset fuzz
+	@scripts/fuzz
+
 format: setup
 	@git ls-files '*.h' '*.cpp' | xargs clang-format -i
 
 tidy: build-hosted
-	@git ls-files '*.cpp' ':!*/windows/*' ':!tests/wizard/*' ':!tests/*Windows*' | xargs -P 2 -n 4 clang-tidy --quiet -p build/hosted
+	@git ls-files '*.cpp' ':!*/windows/*' ':!fuzz/*' ':!tests/wizard/*' ':!tests/*Windows*' | xargs -P 2 -n 4 clang-tidy --quiet -p build/hosted
 
 clean:
 	@rm -rf build dist

@@ -25,6 +25,12 @@ if(HV_SANITIZE)
     add_link_options(-fsanitize=${HV_SANITIZE})
 endif()
 
+# Everything then says which way a run took, and the programs in fuzz/ listen (clang only).
+option(HV_FUZZ "Whether the programs of fuzz/ are built" OFF)
+if(HV_FUZZ)
+    add_compile_options(-fsanitize=fuzzer-no-link)
+endif()
+
 # What ships is stripped and says nothing of the time at which it was made; it may be loaded anywhere, and its data are
 # not run.
 if(WIN32)
@@ -34,6 +40,10 @@ endif()
 add_library(hv_flags INTERFACE)
 target_include_directories(hv_flags INTERFACE ${CMAKE_SOURCE_DIR})
 target_compile_options(hv_flags INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+if(CMAKE_CXX_COMPILER_ID STREQUAL "Clang")
+    # HVL::Version has virtual operations and no virtual destructor, as its header says; clang objects to lists of it.
+    target_compile_options(hv_flags INTERFACE $<$<COMPILE_LANGUAGE:CXX>:-Wno-delete-non-abstract-non-virtual-dtor>)
+endif()
 if(WIN32)
     # NOGDI: the drawing interface defines the macro ERROR, which is the name of a log4cpp priority.
     target_compile_definitions(hv_flags INTERFACE WIN32_LEAN_AND_MEAN NOMINMAX NOGDI _WIN32_WINNT=0x0A00 PSAPI_VERSION=2)

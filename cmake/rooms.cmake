@@ -1,4 +1,4 @@
-# The three things that a room's CMakeLists.txt can ask for. A room's file is a list; the how stands here.
+# The four things that a room's CMakeLists.txt can ask for. A room's file is a list; the how stands here.
 
 # hv_room(NAME SOURCES file... LINKS target...): the static library hv_NAME; what it links, its users link too.
 function(hv_room name)
@@ -31,6 +31,19 @@ function(hv_test name)
     add_test(NAME ${name} COMMAND ${name})
     # A test names its machine. Where it does not, it must fail rather than use the machine in the user's home.
     set_tests_properties(${name} PROPERTIES ENVIRONMENT HV_MACHINE=/dev/null/no-machine)
+endfunction()
+
+# hv_fuzzer(NAME SOURCES file... LINKS target...): the program fuzz_NAME, which calls the sources' LLVMFuzzerTestOneInput
+# with bytes of its own making. The target `fuzzers` is all of them.
+function(hv_fuzzer name)
+    cmake_parse_arguments(ARG "" "" "SOURCES;LINKS" ${ARGN})
+    hv_refuse_leftovers(hv_fuzzer ${name} "${ARG_UNPARSED_ARGUMENTS}")
+    hv_program(fuzz_${name} SOURCES ${ARG_SOURCES} LINKS ${ARG_LINKS} hv_fuzzing)
+    target_link_options(fuzz_${name} PRIVATE -fsanitize=fuzzer)
+    if(NOT TARGET fuzzers)
+        add_custom_target(fuzzers)
+    endif()
+    add_dependencies(fuzzers fuzz_${name})
 endfunction()
 
 # Windows programs carry a manifest: narrow strings are UTF-8, paths may be long, Windows 10 is meant. Elsewhere nothing.

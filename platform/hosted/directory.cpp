@@ -51,7 +51,7 @@ bool Folder::Next() {
 
 file_type Folder::Type() const {
     if (entry_->d_type != DT_UNKNOWN) {
-        return TypeOfMode(DTTOIF(entry_->d_type));
+        return TypeOfMode(static_cast<mode_t>(DTTOIF(entry_->d_type)));
     }
     struct stat found {};
     const bool answered = ::fstatat(::dirfd(stream_), Name(), &found, AT_SYMLINK_NOFOLLOW) == 0;
