@@ -8,7 +8,8 @@ namespace HVBench {
 /// What one run of a program took.
 struct Run {
     double seconds = 0;
-    long peakKilobytes = 0;  // the most memory that it held at once
+    double processorSeconds = 0;  // its own and the system's on its behalf, without waiting for the disk
+    long peakKilobytes = 0;       // the most memory that it held at once
     int status = 0;
 };
 
