@@ -8,8 +8,7 @@ namespace HVBench {
 /// What one run of a program took.
 struct Run {
     double seconds = 0;
-    double processorSeconds = 0;  // its own and the system's on its behalf, without waiting for the disk
-    long peakKilobytes = 0;       // the most memory that it held at once
+    long peakKilobytes = 0;  // the most memory that it held at once
     int status = 0;
 };
 
