@@ -120,7 +120,7 @@ std::optional<HostRecord> ReadPremiere(const Win32RegKeyHandle& key, const std::
 }  // namespace
 
 bool AdobeAEDetector_Win::Run(std::vector<HostRecord>& hosts) {
-    // The first word is misspelt in every log there is, and people search logs for it.
+    // Fixed (contracts, hosts): the first word is misspelt.
     HVL_LOG(Debug, "HV::AdobeAEDector_Win "
                        << "HV::AdobeAEDetector_Win::Run");
     return ReadVersions("\\Adobe\\After Effects", "13.0", ReadAfterEffects, hosts);

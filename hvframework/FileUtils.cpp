@@ -181,8 +181,7 @@ bool GetUniqueFileName(const std::string& path) {
     return GetUniqueFileName(path, Exists);
 }
 
-// Only the flag is given. The caller goes on with the path it has, so handing it the free name would change which
-// script a run appends to.
+// Fixed (contracts, files): only the flag is given, and not the name that was found.
 bool GetUniqueFileName(const std::string& path, const std::function<bool(const std::string&)>& exists) {
     const std::string name = GetFileName(path);
     const std::size_t dot = name.rfind('.');

@@ -21,7 +21,7 @@ constexpr std::string_view kUninstall = "uninstall";
 constexpr std::string_view kUpgrade = "upgrade";
 constexpr std::string_view kInstalledFilePaths = "installed_file_paths";
 
-// Only the first character counts, so "tuesday" is true as well: release tools have written "t", "T", "True" and "1".
+// Fixed (contracts, suite file): only the first character counts, so "tuesday" is true as well.
 bool ReadBool(const std::string& value) {
     return !value.empty() && std::string_view("tT1").find(value.front()) != std::string_view::npos;
 }
@@ -135,8 +135,8 @@ std::int32_t ProductData::GetProductType() const {
     return text.empty() ? -1 : std::atoi(text.c_str());
 }
 
-// The blank before each quote and the one behind each comma are both written: what is compared with this text byte for
-// byte has two blanks between paths. Readers of it also expect backslashes as they are, not escaped.
+// Fixed (contracts, suite file): the blank before each quote and the one after each comma are both written, and nothing
+// is escaped.
 std::string ProductData::GetInstalledFilePathsText() const {
     std::string text = "[";
     for (std::size_t index = 0; index < installedFilePaths.size(); ++index) {

@@ -15,7 +15,7 @@ constexpr const char* kDescription = "Halvorn shortcut";
 using PathBuffer = std::array<wchar_t, 260>;
 using DescriptionBuffer = std::array<wchar_t, 64>;
 
-// The two numbers by which support tells the failures apart. They were line numbers once and do not follow the source.
+// Fixed (contracts, shortcuts): numbers that tell the two failures apart. They name no line of this source.
 constexpr int kNoFileInterface = 503;
 constexpr int kNotSaved = 513;
 

@@ -26,8 +26,7 @@ class HostSearch {
 public:
     HostSearch(const Processes& processes, std::vector<ProcessRecord>& out) : processes_(processes), out_(out) {}
 
-    // The questions are those that the wizard has always asked, and a reader should not make them better without a word
-    // from the people who support it: each process more that it finds is an installation more that does not start.
+    // Fixed (contracts, running programs): each process more that is found is an installation more that does not start.
     // "EDIUS" is compared with a whole file name, which EDIUS.exe is not. "n/a" is the name of no process. HitFilm has
     // no name of its own, so its question finds the processes whose name cannot be read. Nobody is asked to quit Vegas,
     // or whatever else reads the OFX folder.

@@ -16,8 +16,8 @@ std::string JoinedNames(const std::vector<ProcessRecord>& running) {
 }  // namespace
 
 std::string RunningHostsText(const std::vector<ProcessRecord>& running) {
-    // Only the text for a single host ends in a blank. The other one runs into the last sentence ("and retryor
-    // cancel"), and so it stays: support staff and translators know these boxes by their exact words.
+    // Fixed (contracts, wizard): only the text for a single host ends in a blank. The other one runs into the last
+    // sentence ("and retryor cancel").
     const char* const request =
         running.size() == 1
             ? " is a host application for products in the installer; please quit this application and retry "

@@ -45,8 +45,7 @@ Place CheckBoxPlace(int index, Columns page, int firstRow) {
 }
 
 int CheckBoxLabelLeft(const Place& box) {
-    // Measured from the row's height and not from the picture's width: the labels of all rows stand as far from their
-    // pictures as they always have.
+    // Fixed (contracts, wizard): measured from the row's height and not from the picture's width.
     const int height = box.bottom - box.top;
     return box.left + height - 8 + 10;
 }

@@ -141,7 +141,7 @@ void WinWizardController::EnterSelection() {
 
 void WinWizardController::CreateSelectionPage() {
     if (selectionPage != nullptr) {
-        // The sentence lacks a word, and callers compare it as it is.
+        // Fixed (contracts, wizard): the sentence lacks a word.
         throw std::runtime_error("This program not be allocating the selection page twice.");
     }
     const InstallerModel& model = InstallerModel::Instance();

@@ -244,8 +244,8 @@ void ReadPostflights(const TiXmlElement& element, Payload& payload) {
     for (const TiXmlElement* item : ChildrenOf(element, "postflights", "postflight")) {
         if (auto script = ReadScript(*item)) {
             payload.postflights.push_back(std::move(*script));
-            // It is the payload that is named here, and not the script as in the preflights below. Packages and logs in
-            // the field have such payloads under this name; naming the script instead would change what they say.
+            // Fixed (contracts, manifest): it is the payload that is named here, and not the script as in the
+            // preflights below.
             if (payload.id.empty()) {
                 payload.id = "postflight";
             }

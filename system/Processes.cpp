@@ -114,9 +114,9 @@ std::string HostDisplayName(const ProcessRecord& record) {
     if (record.name == "AfterFX.exe") {
         return "After Effects";
     }
-    // Nobody catches this, on purpose: a name without room for an extension is that of a process whose name cannot be
-    // read, and a box that asks the user to quit a program without a name cannot be answered. The words are said here
-    // because each runtime has words of its own for it.
+    // Fixed (contracts, running programs): nothing catches this. A name without room for an extension is that of a
+    // process whose name cannot be read, and a box that asks the user to quit a program without a name cannot be
+    // answered. The words are said here because each runtime has words of its own for it.
     if (record.name.size() < extension.size()) {
         throw std::out_of_range("invalid string position");
     }

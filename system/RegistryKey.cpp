@@ -98,8 +98,7 @@ Win32RegKeyHandle::Win32RegKeyHandle(HKEY parentKey, const std::string& subkey, 
     }
 }
 
-// That a key directly below a hive is left open is part of the promise: `key` is public, and callers may use its value
-// beyond this object. Who is the only user calls Close().
+// Fixed (contracts, registry): a key directly below a hive is left open. Whoever is its only user calls Close().
 Win32RegKeyHandle::~Win32RegKeyHandle() {
     if (!IsPredefined(parent)) {
         Close();

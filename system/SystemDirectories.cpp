@@ -64,8 +64,8 @@ const std::string& ProgramFiles32Directory() {
     return directory;
 }
 
-// An unset variable gives `\Halvorn\logs` on purpose, on the current drive: the fallback of ProgramDataDirectory is not
-// taken here, nor is what that one remembers.
+// Fixed (contracts, system directories): an unset variable gives `\Halvorn\logs`, on the current drive. Neither the
+// fallback of ProgramDataDirectory nor what that one remembers is taken.
 std::string LogsBelow(const char* variable) {
     return JoinPath(JoinPath(GetEnvironmentValue(variable), "Halvorn"), "logs");
 }

@@ -57,8 +57,8 @@ LineSplit SplitArgumentLine(const std::string& line, std::vector<std::string>& a
             singleQuotes.push_back(i);
         }
     }
-    // Single quotes go first, with no regard to double quotes: an apostrophe inside a double-quoted value pairs with
-    // the next apostrophe of the line. Callers quote their lines for exactly this rule.
+    // Fixed (contracts, argument line): single quotes go first, with no regard to double quotes. An apostrophe inside a
+    // double-quoted value pairs with the next apostrophe of the line.
     StrikeOutBetween(singleQuotes, spaces);
     StrikeOutBetween(singleQuotes, doubleQuotes);
     if (doubleQuotes.size() % 2 != 0) {

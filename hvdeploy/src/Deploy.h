@@ -20,7 +20,9 @@
 
 namespace HV {
 
-/// The engine: a folder of packages becomes an installed suite, or the machine goes back to what it was.
+/// The engine: a folder of packages becomes an installed suite, or the files that a failing package and those before it
+/// replaced come back. Registry entries, shortcuts and what scripts did stay, and after some failures the files of
+/// earlier packages too (contracts, results).
 ///
 /// One object serves one run and is used by one thread, the deployment's; Cancel() alone may come from another. Every
 /// operation reports what went wrong by its result and in the log. What it throws is what the filesystem library and a
@@ -43,7 +45,8 @@ public:
     /// last package, or -1 when a dependency is missing.
     EngineResult DeployPackages(const std::vector<fs::path>& paths);
 
-    /// Installs one package. A failure after the first change to the machine has undone the whole run so far.
+    /// Installs one package. A failing payload, script or registry entry, a package that is not sound and a cancel have
+    /// put back the files of the whole run so far. A package that does not extract has put back nothing.
     EngineResult DeployPackage(const fs::path& path);
 
     /// Whether a package is to be installed: it is not in the skip list, and no newer version of it is installed.

@@ -14,8 +14,8 @@ namespace {
 
 constexpr const char* kOwner = "HV::Deploy::";
 
-// The engine treats no package of the folder apart from the others by its identifier, this one neither. The name stays
-// beside the prefixes for the release scripts that search for it.
+// Fixed (contracts, packages folder): the name is reserved. The engine treats no package apart from the others by its
+// identifier, this one neither.
 [[maybe_unused]] constexpr const char* kRuntimePackage = "com.halvorn.vcredist-x64-2012";
 constexpr const char* kPreflightPrefix = "preflight-";
 constexpr const char* kPostflightPrefix = "postflight-";
@@ -97,7 +97,7 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
         return preflightResult;
     }
     const EngineResult result = RunMainPhases(content);
-    // A failed run reports this too: the listener learns of the failure from the final result.
+    // Fixed (contracts, packages folder): a failed run reports this too. Its result tells the listener.
     SetProgress(100.0F, "Installation complete.");
     if (!IsFailure(result)) {
         // The run has succeeded by now, and what becomes of the entry does not change that.
@@ -175,7 +175,7 @@ bool Deploy::IsSuite(const fs::path& suitePath) const {
 }
 
 bool Deploy::SynthesizeSuiteInfoFromProducts(const std::vector<fs::path>& packages, std::string& suiteText) {
-    // The one entry line of this class that names the class once.
+    // Fixed (contracts, run): the one entry line of this class that names the class once.
     HVL_LOG(Debug, kOwner << "SynthesizeSuiteInfoFromProducts");
     for (const fs::path& path : packages) {
         try {

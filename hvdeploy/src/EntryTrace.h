@@ -6,7 +6,7 @@ namespace HV {
 
 /// The line that an operation writes at DEBUG when it is entered. `owner` is its class with "::" behind it.
 ///
-/// The class stands twice in the line ("HV::Deploy::HV::Deploy::DeployPackage"). Support tools look for that text.
+/// Fixed (contracts, run): the class stands twice in the line ("HV::Deploy::HV::Deploy::DeployPackage").
 inline void TraceEntry(const char* owner, const char* operation) {
     HVL_LOG(Debug, owner << owner << operation);
 }

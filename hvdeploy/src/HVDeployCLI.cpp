@@ -25,8 +25,7 @@ constexpr const char* kDir = "dir=";
 constexpr const char* kSkip = "skip=";
 constexpr const char* kList = "list=";
 
-// "rollback=", "manifest=", "uninstall=" and "update=" do nothing: they are there so that the line of an older caller
-// still parses. Taking them out would break such callers.
+// Fixed (contracts, argument line): "rollback=", "manifest=", "uninstall=" and "update=" are accepted and do nothing.
 constexpr std::array kKeys{
     kFile, kDir, "rollback=", kSkip, "manifest=", "uninstall=", kList, "update=", "log=", "loglevel="};
 
@@ -37,7 +36,7 @@ constexpr const char* kLegacyUninstall = "--legacyuninstall";
 constexpr const char* kError = "--error";
 constexpr std::array kFlags{kAbout, kVerbose, kVersion, kLegacyUninstall, kError};
 
-// Values that older callers put behind the no-op keys. No logic compares against them.
+// Fixed (contracts, argument line): reserved words. No logic compares against them.
 [[maybe_unused]] constexpr std::array kReservedWords{"force",   "newer",    "only",  "ignore",
                                                      "enabled", "disabled", "submit"};
 
@@ -164,8 +163,8 @@ int DeployCLI::RunCommand() {
     HVL_LOG(Info, kOwner << "HV::DeployCLI::Run");
     verbose = HasFlag(kVerbose);
     PrintBanner();
-    // The flags that print something do not end the run: a line that holds only "--version" goes on to deploy the
-    // default folder, and callers use it that way.
+    // Fixed (contracts, run): the flags that print something do not end the run. A line that holds only "--version"
+    // goes on to deploy the default folder.
     return CountArg(kList) ? DoListCommand() : DoDeployCommand();
 }
 
@@ -183,8 +182,7 @@ void DeployCLI::PrintBanner() {
     }
 }
 
-// A search for characters, not for the word "ERROR": the engines before this one put the number at that distance from
-// any of these letters, and their texts are still passed through here.
+// Fixed (contracts, run): a search for any of these characters, not for the word "ERROR".
 int ErrorCodeFromText(const std::string& text) {
     const std::size_t mark = text.find_first_of("ERO(");
     if (mark == std::string::npos) {

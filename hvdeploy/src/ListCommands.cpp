@@ -67,7 +67,7 @@ int DeployCLI::ListPackages() {
     return 0;
 }
 
-// The two share one text; the log of a caller that asks for the commands is searched for it.
+// Fixed (contracts, run): the text is that of the packages.
 int DeployCLI::ListCommands() {
     TraceEntry(kOwner, "ListCommands");
     HVL_LOG(Warn, "ListPackages not yet implemented.");

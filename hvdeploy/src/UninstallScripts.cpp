@@ -89,8 +89,8 @@ std::string Today() {
 
 }  // namespace
 
-// Scripts in the field begin with exactly these bytes: bare carriage returns between the lines, and no equals sign
-// behind the first SCRIPT_NAME. Whoever compares scripts of two releases relies on it.
+// Fixed (contracts, removal script): bare carriage returns between the lines, and no equals sign after the first
+// SCRIPT_NAME.
 std::string ScriptMaker::GetHeader() const {
     return "@echo off\rSET SCRIPT_NAME%0\rSET SCRIPT_DIR=%~dp0\rSET SCRIPT_PATH=%SCRIPT_DIR%%SCRIPT_NAME%\r";
 }
@@ -222,8 +222,7 @@ void OSRegisterUninstall(const std::string& scriptPath, const HVL::ProductData& 
     int minorNumber = 0;
     int patchNumber = 0;
     HVL::Version(product.GetVersion()).GetShortParts(majorNumber, minorNumber, patchNumber);
-    // These values and no others: a size, a display version or links are left out on purpose, because administrators
-    // tell the entries of a suite apart by their names and compare the rest value by value.
+    // Fixed (contracts, installed programs): these values and no others.
     SetText(entry.key, "DisplayName", product.GetDisplayName());
     SetNumber(entry.key, "MajorVersion", majorNumber);
     SetNumber(entry.key, "MinorVersion", minorNumber);

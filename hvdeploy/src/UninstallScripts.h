@@ -23,7 +23,7 @@ void OSRegisterUninstall(const std::string& scriptPath, const HVL::ProductData& 
 /// Writes batch files segment by segment, one for each package of a product.
 ///
 /// It remembers the lines of the script that it wrote last, so that a run over many packages does not read a growing
-/// file again for each. A script that somebody else has touched meanwhile is read anew. Not thread-safe.
+/// file again for each. A script whose size has changed meanwhile is read anew. Not thread-safe.
 class UninstallScripts {
 public:
     /// Appends the package's segment, in which the script deletes `installedFiles` (and `extraPath`, unless it is

@@ -33,7 +33,7 @@ private:
     [[nodiscard]] bool OnDrawItem(const DRAWITEMSTRUCT& item) const;
     void OnCommand(WPARAM command);
 
-    // Without an owner on purpose: the corners of these buttons are black.
+    // Fixed (contracts, wizard): without an owner, so the corners of these buttons are black.
     CustomButton closeButton_;
     CustomButton saveButton_;
     HWND richText_ = nullptr;

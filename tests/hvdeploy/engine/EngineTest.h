@@ -32,7 +32,7 @@ public:
     std::function<void(std::size_t)> onReport;
 };
 
-/// Finds the hosts that a test says are there, or throws what a test wants thrown.
+/// Finds the hosts that a test says are there.
 class TestHosts : public HV::HostAppDetector {
 public:
     explicit TestHosts(std::vector<HV::HostRecord> records) : records_(std::move(records)) {}
