@@ -9,8 +9,10 @@
 #include "hosts/HostRegistry.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/FileVersion.h"
+#include "hvframework/Log.h"
 #include "hvframework/StringUtils.h"
 #include "hvframework/Version.h"
+#include "platform/filesystem.h"
 #include "system/SystemDirectories.h"
 
 namespace HV {
@@ -73,17 +75,24 @@ std::string VegasHelpFolder() {
     return ReadText(shared, "HelpFolder");
 }
 
-std::string VegasExecutable(const std::string& appDir) {
-    std::vector<std::string> files;
-    const bool matched = HVL::FileUtils::MatchFilesInDirectory(appDir, "vegas*.exe", files);
-    return VegasDetector_Win::FirstMatch(matched, files);
+// A folder that cannot be listed costs the executable and nothing else: one version that is in disorder must not keep
+// the other hosts of the machine from being found.
+std::string VegasExecutable(const std::string& version, const std::string& appDir) {
+    try {
+        std::vector<std::string> files;
+        const bool matched = HVL::FileUtils::MatchFilesInDirectory(appDir, "vegas*.exe", files);
+        return VegasDetector_Win::FirstMatch(matched, files);
+    } catch (const fs::filesystem_error& error) {
+        HVL_LOG(Warn, "could not list the folder of Vegas " << version << ": " << error.what());
+        return "";
+    }
 }
 
 HostRecord MakeVegas(const std::string& version, const std::string& appDir, const std::string& helpFolder) {
     // It has no display name: a version of Vegas is told by its number alone, and listings have never shown another.
     HostRecord host = FreshRecord(HostType::Vegas, "vegas");
     host.hostVersion = version;
-    host.hostAppPath = VegasExecutable(appDir);
+    host.hostAppPath = VegasExecutable(version, appDir);
     host.hostPluginPath = OfxFolder();
     host.hostSharedPath = OfxFolder();
     host.hostDocsPath = helpFolder;

@@ -6,7 +6,8 @@
 #include "hosts/HostAppDetector.h"
 
 /// The hosts of other vendors, whose plug-ins mostly go to the one OFX folder of the system. Each detector reads the
-/// machine-wide registry; a value that cannot be read leaves its field empty and stops nothing. They log nothing.
+/// machine-wide registry; a value that cannot be read leaves its field empty and stops nothing. What goes wrong
+/// is not logged, but for a folder that cannot be listed.
 namespace HV {
 
 /// EDIUS: one record for each subkey that has an installation with a folder. Says on standard output which registry
@@ -35,7 +36,7 @@ public:
 };
 
 /// Vegas Pro: one record for each version that names its folder; the executable is the first "vegas*.exe" in there.
-/// Raises what listing that folder raises.
+/// It stays empty, with a line in the log, where the folder cannot be listed.
 class VegasDetector_Win : public HostAppDetector {
 public:
     bool Run(std::vector<HostRecord>& hosts) override;

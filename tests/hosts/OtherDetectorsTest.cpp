@@ -9,6 +9,7 @@
 #include "tests/hosts/DetectorTest.h"
 #include "tests/hosts/TestExecutables.h"
 #include "tests/support/CapturedStreams.h"
+#include "tests/support/UnreadableFile.h"
 
 namespace {
 
@@ -377,6 +378,24 @@ TEST_F(VegasDetector, CountsAVersionWhoseFolderDoesNotExist) {
     EXPECT_TRUE(Run());
     ASSERT_EQ(hosts.size(), 1U);
     EXPECT_EQ(hosts.front().hostAppPath, "");
+}
+
+// Its plug-ins go to the OFX folder, so it needs no executable to count; the versions after it are found as well.
+TEST_F(VegasDetector, CountsAVersionWhoseFolderCannotBeListedAndSaysSo) {
+    HasVegas("13.0");
+    HasVegas("14.0");
+    machine.Has(FolderOf("13.0") + R"(\vegas130.exe)", "the program");
+    machine.Has(FolderOf("14.0") + R"(\vegas140.exe)", "the program");
+    const UnreadableFile unreadable(machine, FolderOf("13.0"));
+    EXPECT_TRUE(Run());
+    ASSERT_EQ(Versions(), (Texts{"13.0", "14.0"}));
+    EXPECT_EQ(hosts[0].hostAppPath, "");
+    EXPECT_EQ(hosts[0].hostPluginPath, kOfxFolder);
+    EXPECT_EQ(hosts[1].hostAppPath, FolderOf("14.0") + R"(\vegas140.exe)");
+    const Texts warnings = log.LinesStartingWith("WARN hvdeploy-detail: could not list the folder of Vegas 13.0: ");
+    ASSERT_EQ(warnings.size(), 1U) << log.Text();
+    EXPECT_NE(warnings[0].find("VEGAS Pro 13.0"), std::string::npos) << warnings[0];
+    EXPECT_EQ(log.Lines(), warnings);
 }
 
 TEST_F(VegasDetector, TakesNoOtherFileForTheExecutable) {

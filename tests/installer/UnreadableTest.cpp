@@ -1,6 +1,6 @@
 // Files of the packages folder that are there and cannot be read.
 #include "tests/installer/ModelTest.h"
-#include "tests/installer/UnreadableFile.h"
+#include "tests/support/UnreadableFile.h"
 
 namespace {
 

@@ -2,7 +2,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "tests/installer/UnreadableFile.h"
+#include "tests/support/UnreadableFile.h"
 
 namespace {
 

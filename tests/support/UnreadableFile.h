@@ -5,7 +5,7 @@
 
 #include "tests/support/Machine.h"
 
-/// While it lives, the file (hosted: or the folder) is there and cannot be read: by its rights on the hosted machine,
+/// While it lives, the file or the folder is there and cannot be read: by its rights on the hosted machine,
 /// by another's handle on Windows. What cannot be arranged fails the test.
 class UnreadableFile {
 public:

@@ -1,13 +1,12 @@
-// A packages folder that is there and cannot be listed. Under Wine nothing refuses that to a program, so the claim is
-// held to the hosted machine alone.
+// A packages folder that is there and cannot be listed.
 #include "tests/installer/ModelTest.h"
-#include "tests/installer/UnreadableFile.h"
+#include "tests/support/UnreadableFile.h"
 
 namespace {
 
-using HostedUnreadableFolderTest = ModelTest;
+using UnreadableFolderTest = ModelTest;
 
-TEST_F(HostedUnreadableFolderTest, IsNotValidAndSaysNothing) {
+TEST_F(UnreadableFolderTest, IsNotValidAndSaysNothing) {
     setup.HasSuite();
     setup.Ships(Product("glow"));
     const UnreadableFile unreadable(machine, kPackages);
