@@ -30,13 +30,13 @@ std::wstring KeyOf(const fs::path& path) {
     return key;
 }
 
-// The way back goes on whatever happens, so what the filesystem library throws is one more failed step here. What
-// cannot be put back has no message of its own, whichever way the move tells of it.
-void MoveBack(const fs::path& stashed, const fs::path& original) {
+// Whether the move is done. A move to another volume is a copy, and tells of a failure by what the filesystem library
+// throws: here that is a failed move like any other, because both ways go on past it.
+bool Move(const std::string& from, const std::string& to) {
     try {
-        (void)FileUtils::MoveFileOrDirectory(stashed.string(), original.string());
+        return FileUtils::MoveFileOrDirectory(from, to);
     } catch (const std::exception&) {
-        return;
+        return false;
     }
 }
 
@@ -59,7 +59,7 @@ void DeployRollback::StashExistingFile(const fs::path& path) {
     const std::string original = path.string();
     // The stash is flat; the random part of the name keeps two files of one name apart.
     const std::string target = FileUtils::MakeTempPath(FileUtils::GetFileName(original), stashDir.string());
-    if (FileUtils::MoveFileOrDirectory(original, target)) {
+    if (Move(original, target)) {
         stashedFiles.emplace_back(path, target);
     } else {
         HVL_LOG(Warn, "Failed to move/copy existing item to rollback stash, from " << path);
@@ -104,7 +104,8 @@ void DeployRollback::RemoveInstalledFiles() {
 void DeployRollback::RestoreStashedFiles() {
     for (const auto& [original, stashed] : stashedFiles) {
         HVL_LOG(Debug, "Restoring original file at " << original);
-        MoveBack(stashed, original);
+        // What cannot be put back has no message of its own.
+        (void)Move(stashed.string(), original.string());
     }
 }
 

@@ -1,4 +1,5 @@
 // The way back: what was installed goes, what was there comes back.
+#include "hvframework/FileUtils.h"
 #include "tests/hvdeploy/engine/EngineTest.h"
 
 namespace {
@@ -13,6 +14,15 @@ protected:
 class EngineRollbackTest : public EngineTest {};
 
 constexpr const char* kFile = R"(C:\Data\Glow.dll)";
+
+/// Puts a file in the place of the one stash that is there, so that nothing can be moved or copied into it.
+void SpoilStash(Machine& machine) {
+    const std::vector<std::string> entries = machine.TempEntries();
+    ASSERT_EQ(entries.size(), 1U);
+    const std::string stash = machine.TempFolder() + "\\" + entries[0];
+    ASSERT_EQ(HVL::FileUtils::DeleteFileOrDirectory(stash), 0);
+    machine.Has(stash, "no folder");
+}
 
 }  // namespace
 
@@ -44,6 +54,21 @@ TEST_F(RollbackTest, WarnsOfAnItemThatCannotBeMovedAside) {
     rollback.StashExistingFile(fs::path(kFile));
     EXPECT_TRUE(log.Has(WarnLine(R"(Failed to move/copy existing item to rollback stash, from "C:\Data\Glow.dll")")))
         << log.Text();
+    log.Clear();
+    rollback.Rollback();
+    EXPECT_EQ(log.Lines(), std::vector<std::string>{DebugLine("HV::DeployRollback::HV::DeployRollback::Rollback")});
+}
+
+// Volumes are told apart by their texts, so the drive in lower case is another one: the move is a copy there, and a
+// copy that fails throws.
+TEST_F(RollbackTest, WarnsOfAnItemThatCannotBeCopiedToTheStashOnAnotherVolume) {
+    machine.Has(kFile, "old");
+    HV::DeployRollback rollback;
+    SpoilStash(machine);
+    EXPECT_NO_THROW(rollback.StashExistingFile(fs::path(R"(c:\Data\Glow.dll)")));
+    EXPECT_TRUE(log.Has(WarnLine(R"(Failed to move/copy existing item to rollback stash, from "c:\Data\Glow.dll")")))
+        << log.Text();
+    EXPECT_EQ(machine.Content(kFile), "old");
     log.Clear();
     rollback.Rollback();
     EXPECT_EQ(log.Lines(), std::vector<std::string>{DebugLine("HV::DeployRollback::HV::DeployRollback::Rollback")});
@@ -115,8 +140,7 @@ TEST_F(RollbackTest, RunsTwiceQuietly) {
     EXPECT_EQ(log.LinesStartingWith("WARN").size(), 0U) << log.Text();
 }
 
-// Volumes are told apart by their texts, so the drive in lower case is another one: the move is a copy there, and a
-// copy onto a file that is there throws.
+// On another volume, as above; a copy onto a file that is there throws.
 TEST_F(RollbackTest, GoesOnWithoutAWordPastAnItemThatCannotGoBack) {
     machine.Has(R"(C:\Data\first.dll)", "old");
     machine.Has(R"(C:\Data\second.dll)", "old");
