@@ -27,33 +27,33 @@ char Lower(char c) {
 
 /// Steps over the text as the library does, without building anything and without recursion.
 ///
-/// Each step returns false where the library gives up; what it has nested by then has been counted. The steps follow
+/// Each step returns false where the library gives up; what it has taken by then has been counted. The steps follow
 /// the library's, oddities included, because a difference would let a text hide its depth: a character that swallows
-/// the
-/// `<` behind it, a quote behind a byte order mark, a `>` inside a value.
+/// the `<` behind it, a quote behind a byte order mark, a `>` inside a value.
 class NestingScan {
 public:
     NestingScan(const char* text, Reading reading) : p_(text), reading_(reading) {}
 
-    std::size_t Deepest() {
+    XmlShape Measure() {
         while (SkipBlanks(), *p_ == '<') {
             const bool declaration = AtDeclaration();
             if (!(declaration ? SkipDeclaration() : SkipTopNode())) {
                 break;
             }
             if (declaration && reading_ == Reading::Undecided) {
-                return DeepestInEitherReading();
+                return ShapeInEitherReading();
             }
         }
-        return deepest_;
+        return shape_;
     }
 
 private:
     /// The declaration's word for the encoding need not be understood when both readings are tried.
-    [[nodiscard]] std::size_t DeepestInEitherReading() const {
-        const std::size_t bytes = NestingScan(p_, Reading::Bytes).Deepest();
-        const std::size_t utf8 = NestingScan(p_, Reading::Utf8).Deepest();
-        return std::max({deepest_, bytes, utf8});
+    [[nodiscard]] XmlShape ShapeInEitherReading() const {
+        const XmlShape bytes = NestingScan(p_, Reading::Bytes).Measure();
+        const XmlShape utf8 = NestingScan(p_, Reading::Utf8).Measure();
+        return {std::max({shape_.deepest, bytes.deepest, utf8.deepest}),
+                std::max({shape_.mostAttributes, bytes.mostAttributes, utf8.mostAttributes})};
     }
 
     /// An element with all that is in it, or any other node.
@@ -98,16 +98,18 @@ private:
     }
 
     bool SkipStartTag() {
-        deepest_ = std::max(deepest_, ++depth_);
+        shape_.deepest = std::max(shape_.deepest, ++depth_);
         ++p_;
         SkipBlanks();
         if (!SkipName()) {
             return false;
         }
+        std::size_t attributes = 0;
         while (SkipBlanks(), *p_ != '>' && *p_ != '/') {
             if (!SkipAttribute()) {
                 return false;
             }
+            shape_.mostAttributes = std::max(shape_.mostAttributes, ++attributes);
         }
         if (*p_++ == '>') {
             return true;
@@ -225,14 +227,28 @@ private:
     const char* p_;
     Reading reading_;
     std::size_t depth_ = 0;
-    std::size_t deepest_ = 0;
+    XmlShape shape_;
 };
 
 }  // namespace
 
-std::size_t DeepestNesting(const std::string& text) {
+XmlShape MeasureXml(const std::string& text) {
     const bool marked = text.compare(0, 3, "\xEF\xBB\xBF") == 0;
-    return NestingScan(text.c_str(), marked ? Reading::Utf8 : Reading::Undecided).Deepest();
+    return NestingScan(text.c_str(), marked ? Reading::Utf8 : Reading::Undecided).Measure();
+}
+
+std::string ExcessOfXml(const std::string& text) {
+    if (text.size() > kLongestXml + kXmlPadding) {
+        return "the text is longer than " + std::to_string(kLongestXml) + " bytes";
+    }
+    const XmlShape shape = MeasureXml(text);
+    if (shape.deepest > kDeepestElement) {
+        return "elements are nested more than " + std::to_string(kDeepestElement) + " deep";
+    }
+    if (shape.mostAttributes > kMostAttributes) {
+        return "an element has more than " + std::to_string(kMostAttributes) + " attributes";
+    }
+    return "";
 }
 
 }  // namespace HVL

@@ -93,12 +93,13 @@ bool ReadPayloads(const TiXmlElement& root, std::vector<Payload>& payloads) {
     return true;
 }
 
-/// The library trusts its input in two ways that a package from outside must not be trusted in: it steps over the end
-/// of a text that stops within a character, hence the zeros behind it, and it goes as deep as elements are nested.
+/// The library trusts its input in ways that a package from outside must not be trusted in: it steps over the end of a
+/// text that stops within a character, hence the zeros behind it, goes as deep as elements are nested, and takes time
+/// and memory as the text wants.
 bool ParseTree(const std::string& text, TiXmlDocument& document) {
     const std::string padded = text + std::string(HVL::kXmlPadding, '\0');
-    if (HVL::DeepestNesting(padded) > HVL::kDeepestElement) {
-        HVL_LOG(Error, "XML parsing failed: elements are nested more than " << HVL::kDeepestElement << " deep");
+    if (const std::string excess = HVL::ExcessOfXml(padded); !excess.empty()) {
+        HVL_LOG(Error, "XML parsing failed: " << excess);
         return false;
     }
     document.Parse(padded.c_str(), nullptr, TIXML_ENCODING_UNKNOWN);

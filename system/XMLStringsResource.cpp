@@ -28,10 +28,10 @@ bool Refuse(const std::string& line) {
     return false;
 }
 
-/// Without a word when the text is no XML, or nested so deep that the library would not survive it.
+/// Without a word when the text is no XML, or more than the library would survive.
 bool ReadTree(const std::string& xml, TiXmlDocument& document) {
     const std::string padded = xml + std::string(HVL::kXmlPadding, '\0');
-    if (HVL::DeepestNesting(padded) > HVL::kDeepestElement) {
+    if (!HVL::ExcessOfXml(padded).empty()) {
         return false;
     }
     document.Parse(padded.c_str(), nullptr, TIXML_ENCODING_UNKNOWN);

@@ -15,7 +15,7 @@ std::string Padded(std::string_view text) {
 }
 
 std::size_t Scanned(std::string_view text) {
-    return HVL::DeepestNesting(Padded(text));
+    return HVL::MeasureXml(Padded(text)).deepest;
 }
 
 std::size_t DepthBelow(const TiXmlNode& node) {
@@ -26,11 +26,33 @@ std::size_t DepthBelow(const TiXmlNode& node) {
     return deepest;
 }
 
-/// How deep the library really went.
-std::size_t Reached(std::string_view text) {
+std::size_t AttributesBelow(const TiXmlNode& node) {
+    std::size_t most = 0;
+    if (const TiXmlElement* element = node.ToElement()) {
+        for (const TiXmlAttribute* each = element->FirstAttribute(); each != nullptr; each = each->Next()) {
+            ++most;
+        }
+    }
+    for (const TiXmlNode* child = node.FirstChild(); child != nullptr; child = child->NextSibling()) {
+        most = std::max(most, AttributesBelow(*child));
+    }
+    return most;
+}
+
+/// What the library really made of the text.
+HVL::XmlShape Made(std::string_view text) {
     TiXmlDocument document;
     document.Parse(Padded(text).c_str(), nullptr, TIXML_ENCODING_UNKNOWN);
-    return DepthBelow(document);
+    return {DepthBelow(document), AttributesBelow(document)};
+}
+
+/// How deep the library really went.
+std::size_t Reached(std::string_view text) {
+    return Made(text).deepest;
+}
+
+std::size_t ScannedAttributes(std::string_view text) {
+    return HVL::MeasureXml(Padded(text)).mostAttributes;
 }
 
 std::string Repeated(std::string_view text, int times) {
@@ -97,15 +119,42 @@ TEST(XmlNesting, IsNeverLessThanWhatTheLibraryReaches) {
     std::mt19937 random(20240607);
     std::uniform_int_distribution<std::size_t> piece(0, kPieces.size() - 1);
     int deeper = 0;
+    int dressed = 0;
     for (int round = 0; round < 100000; ++round) {
         std::string text = round % 3 == 0 ? "\xEF\xBB\xBF" : "";
         for (std::size_t count = 1 + piece(random); count > 0; --count) {
             text += kPieces[piece(random)];
         }
-        ASSERT_GE(Scanned(text), Reached(text)) << text;
-        deeper += Reached(text) > 1 ? 1 : 0;
+        const HVL::XmlShape made = Made(text);
+        ASSERT_GE(Scanned(text), made.deepest) << text;
+        ASSERT_GE(ScannedAttributes(text), made.mostAttributes) << text;
+        deeper += made.deepest > 1 ? 1 : 0;
+        dressed += made.mostAttributes > 0 ? 1 : 0;
     }
     EXPECT_GT(deeper, 2000) << "too few of the texts nest anything";
+    EXPECT_GT(dressed, 500) << "too few of the texts have an attribute";
+}
+
+TEST(XmlNesting, CountsTheAttributesOfTheElementThatHasTheMost) {
+    EXPECT_EQ(ScannedAttributes("<a/>"), 0U);
+    EXPECT_EQ(ScannedAttributes("<a b='1' c=\"2\" d=3 ><e f='g=h i=j'/></a>"), 3U);
+    EXPECT_EQ(ScannedAttributes("<?xml version='1.0'?><a><b c=''/><b c='' d=''/></a>"), 2U);
+    std::string crowd;
+    for (int number = 0; number < 80000; ++number) {
+        crowd += " a" + std::to_string(number) + "=''";
+    }
+    EXPECT_EQ(ScannedAttributes("<a" + crowd + "/>"), 80000U);
+    EXPECT_EQ(ScannedAttributes("<a" + crowd), 80000U) << "what is never closed counts";
+}
+
+TEST(XmlNesting, SaysWhatIsTooMuch) {
+    EXPECT_EQ(HVL::ExcessOfXml(Padded("<a b='c'/>")), "");
+    EXPECT_EQ(HVL::ExcessOfXml(Padded(Repeated("<a>", 201))), "elements are nested more than 200 deep");
+    EXPECT_EQ(HVL::ExcessOfXml(Padded("<a" + Repeated(" b=''", 256) + "/>")), "");
+    EXPECT_EQ(HVL::ExcessOfXml(Padded("<a" + Repeated(" b=''", 257) + "/>")),
+              "an element has more than 256 attributes");
+    EXPECT_EQ(HVL::ExcessOfXml(Padded(std::string(4194304, ' '))), "");
+    EXPECT_EQ(HVL::ExcessOfXml(Padded(std::string(4194305, ' '))), "the text is longer than 4194304 bytes");
 }
 
 }  // namespace

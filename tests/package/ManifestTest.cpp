@@ -281,6 +281,34 @@ TEST_F(ManifestTest, NestedUpToTheLimitParses) {
     EXPECT_FALSE(manifest.Parse(ManifestOf("<a>" + nested + "</a>")));
 }
 
+/// This many attributes, each with a name of its own.
+std::string Attributes(int count) {
+    std::string attributes;
+    for (int number = 0; number < count; ++number) {
+        attributes += " a" + std::to_string(number) + "=''";
+    }
+    return attributes;
+}
+
+TEST_F(ManifestTest, WithMoreAttributesThanAnyoneWritesFailsWithAReason) {
+    const std::string line = Error("XML parsing failed: an element has more than 256 attributes");
+    EXPECT_FALSE(manifest.Parse(ManifestOf("<x" + Attributes(257) + "/>")));
+    EXPECT_EQ(log.Lines(), std::vector{line});
+    log.Clear();
+    EXPECT_FALSE(manifest.Parse(ManifestOf("<x" + Attributes(80000) + "/>"))) << "and that at once, not in a minute";
+    EXPECT_EQ(log.Lines(), std::vector{line});
+    EXPECT_TRUE(manifest.Parse(ManifestOf("<x" + Attributes(256) + "/>")));
+}
+
+TEST_F(ManifestTest, LongerThanAnyoneWritesFailsWithAReason) {
+    const std::size_t longest = std::size_t{4} << 20;
+    const std::string room(longest - ManifestOf("").size(), ' ');
+    EXPECT_TRUE(manifest.Parse(ManifestOf(room)));
+    EXPECT_TRUE(log.Lines().empty());
+    EXPECT_FALSE(manifest.Parse(ManifestOf(room + " ")));
+    EXPECT_EQ(log.Lines(), std::vector{Error("XML parsing failed: the text is longer than 4194304 bytes")});
+}
+
 TEST_F(ManifestTest, ThatEndsWithinACharacterIsReadToItsEnd) {
     int tried = 0;
     for (const std::string cut : {"\xC3", "\xE2", "\xE2\x82", "\xF0", "\xF0\x9F", "\xF0\x9F\x98"}) {
