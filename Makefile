@@ -7,7 +7,7 @@ SHELL := /bin/bash
 export CCACHE_BASEDIR := $(CURDIR)
 export CCACHE_NOHASHDIR := 1
 
-.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench fuzz format tidy clean
+.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench fuzz format lint lint-changed tidy clean
 
 help:
 	@echo "make demo                install the sample suite on a fresh machine and show what came of it"
@@ -22,7 +22,9 @@ help:
 	@echo "make bench               speed and memory, against standard tools"
 	@echo "make fuzz                bytes that crash, stall or bloat a reader; FUZZ_SECONDS=30"
 	@echo "make format              apply .clang-format"
-	@echo "make tidy                run clang-tidy"
+	@echo "make lint                form, spelling, house rules and clang-tidy of all that ships"
+	@echo "make lint-changed        the same, with clang-tidy of what differs from the last commit alone"
+	@echo "make tidy                clang-tidy with its analyzer, of the tests too"
 	@echo "make setup               install what is missing, and nothing else"
 	@echo "make clean               remove build and dist"
 
@@ -84,8 +86,16 @@ fuzz: setup
 format: setup
 	@git ls-files '*.h' '*.cpp' | xargs clang-format -i
 
-tidy: build-hosted
-	@git ls-files '*.cpp' ':!*/windows/*' ':!fuzz/*' ':!tests/wizard/*' ':!tests/*Windows*' | xargs -P 2 -n 4 clang-tidy --quiet -p build/hosted
+# clang-tidy reads the headers and sources that a build makes.
+lint: build-hosted build-windows
+	@scripts/lint
+
+lint-changed: setup
+	@cmake --preset hosted >/dev/null && cmake --preset windows >/dev/null
+	@scripts/lint --changed
+
+tidy: build-hosted build-windows
+	@scripts/tidy --deep
 
 clean:
 	@rm -rf build dist

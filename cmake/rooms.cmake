@@ -29,6 +29,7 @@ function(hv_test name)
     hv_refuse_leftovers(hv_test ${name} "${ARG_UNPARSED_ARGUMENTS}")
     hv_program(${name} SOURCES ${ARG_SOURCES} LINKS ${ARG_LINKS} hv_test_support third::gtest_main)
     add_test(NAME ${name} COMMAND ${name})
+    set_property(GLOBAL APPEND PROPERTY HV_TEST_PROGRAMS ${name})
     # A test names its machine. Where it does not, it must fail rather than use the machine in the user's home.
     set_tests_properties(${name} PROPERTIES ENVIRONMENT HV_MACHINE=/dev/null/no-machine)
 endfunction()
