@@ -69,6 +69,7 @@ $(PRESETS:%=build-%): build-%: setup
 	@echo "== Building the preset $*"
 	@cmake --preset $* >/dev/null
 	@cmake --build --preset $*
+	@ln -sf build/hosted/compile_commands.json .
 
 $(PRESETS:%=test-on-%): test-on-%: build-%
 	@echo "== Testing the preset $*"
