@@ -25,9 +25,12 @@ public:
     /// nothing is replaced.
     void ReplaceAll(const std::string& token, const std::string& replacement);
 
+protected:
+    // Texts by language and key. Those of other languages than English are kept up to date and asked by tests alone.
+    std::map<std::string, std::map<std::string, std::string>> languages;
+
 private:
     std::string version;  // of the form; a table has to have one, and nobody asks which
-    std::map<std::string, std::map<std::string, std::string>> languages;
 };
 
 /// The table that is compiled into this program (number 136, type "HVSTRINGS_XML"), or an empty text.

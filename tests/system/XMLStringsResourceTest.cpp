@@ -276,14 +276,22 @@ TEST(StringsReplacement, FillsInEveryOccurrence) {
     EXPECT_EQ(Replaced("TTT", "T", ""), "");
 }
 
-TEST(StringsReplacement, FillsInEveryText) {
-    XMLStringsResource table;
-    ASSERT_TRUE(
-        table.Parse(Table(R"(<string key="a">T</string><string key="b">xT</string><string key="c">c</string>)")));
+/// A table that shows the texts of every language.
+class OpenTable : public XMLStringsResource {
+public:
+    using XMLStringsResource::languages;
+};
+
+TEST(StringsReplacement, FillsInEveryTextOfEveryLanguage) {
+    OpenTable table;
+    ASSERT_TRUE(table.Parse(
+        R"(<hvstrings version="1.0"><strings lang="de"><string key="a">T auf Deutsch</string></strings>)"
+        R"(<strings lang="en"><string key="a">T</string><string key="b">xT</string><string key="c">c</string></strings>)"
+        R"(<strings lang="fr"><string key="b">T, en T</string></strings></hvstrings>)"));
     table.ReplaceAll("T", "U");
-    EXPECT_EQ(table.GetString("a"), "U");
-    EXPECT_EQ(table.GetString("b"), "xU");
-    EXPECT_EQ(table.GetString("c"), "c");
+    const decltype(table.languages) expected = {
+        {"de", {{"a", "U auf Deutsch"}}}, {"en", {{"a", "U"}, {"b", "xU"}, {"c", "c"}}}, {"fr", {{"b", "U, en U"}}}};
+    EXPECT_EQ(table.languages, expected);
 }
 
 TEST(StringsReplacement, DoesNotLookAtWhatItHasInserted) {
