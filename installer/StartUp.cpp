@@ -21,7 +21,8 @@ std::string PropertyFileOfTheMachine() {
     return FileUtils::JoinPath(FileUtils::JoinPath(company, "Installer"), "halvorn.logging.config");
 }
 
-// What fails here shows when the file is handed to log4cpp.
+// What fails here is reported by ConfigureLogging: a property file that is not there, or a log file that it cannot
+// open.
 std::string MakePropertyFile() {
     const std::string folder = FileUtils::MakeTempPath("tmp", FileUtils::GetTempDirectory());
     (void)FileUtils::CreateDirectories(folder);
@@ -44,10 +45,9 @@ std::string PackagesDirectoryPath() {
 
 void StartLogging() {
     const std::string file = ChoosePropertyFile();
-    // Twice, and it stays so: pairs are what the start of a wizard looks like to those who read its log. A property
-    // file that lets the test lines through gets each of them twice, and a refusal is reported twice. The second round
-    // puts new appenders in the place of the first's, which the library then forgets: a file that such a one held open
-    // could not be rolled over.
+    // Fixed (contracts, log): configured twice. A property file that lets the test lines through gets each of them
+    // twice, and what cannot be done is reported twice. The second round puts new appenders in the place of the
+    // first's, which the library then forgets: a file that such a one held open could not be rolled over.
     (void)ConfigureLogging(file);
     log4cpp::Appender::closeAll();
     (void)ConfigureLogging(file);

@@ -1,6 +1,7 @@
 #include "hvdeploy/src/Logging.h"
 
 #include <boost/exception/all.hpp>
+#include <log4cpp/Appender.hh>
 #include <log4cpp/BasicLayout.hh>
 #include <log4cpp/Category.hh>
 #include <log4cpp/FileAppender.hh>
@@ -13,7 +14,10 @@
 #include <cctype>
 #include <cstdio>
 #include <iostream>
+#include <memory>
+#include <set>
 #include <stdexcept>
+#include <vector>
 
 #include "hvdeploy/src/HVDeployCLI.h"
 #include "hvframework/FileUtils.h"
@@ -106,11 +110,35 @@ void AddConsole(log4cpp::Category& category) {
     category.addAppender(console);
 }
 
-void AddLogFile(log4cpp::Category& category, const std::string& fileName) {
+// What the library's appenders tell their heirs alone. One that cannot open its file says nothing, and neither does any
+// line that it is given.
+struct OpenFile : log4cpp::FileAppender {
+    static bool IsMissing(const log4cpp::FileAppender& appender) { return appender.*&OpenFile::_fd < 0; }
+    static std::string NameOf(const log4cpp::FileAppender& appender) { return appender.*&OpenFile::_fileName; }
+};
+
+// Returns whether the file could be opened.
+bool AddLogFile(log4cpp::Category& category, const std::string& fileName) {
     auto* const file = new log4cpp::FileAppender("logfile", platform::LibraryFileName(fs::path(fileName)), true,
                                                  static_cast<mode_t>(kLogFileMode));
     file->setLayout(new log4cpp::BasicLayout());
     category.addAppender(file);
+    return !OpenFile::IsMissing(*file);
+}
+
+// Each name once, however many categories share the file.
+std::set<std::string> LogFilesThatAreMissing() {
+    const std::unique_ptr<std::vector<log4cpp::Category*>> categories(log4cpp::Category::getCurrentCategories());
+    std::set<std::string> names;
+    for (log4cpp::Category* const category : *categories) {
+        for (log4cpp::Appender* const appender : category->getAllAppenders()) {
+            const auto* const file = dynamic_cast<log4cpp::FileAppender*>(appender);
+            if (file != nullptr && OpenFile::IsMissing(*file)) {
+                names.insert(OpenFile::NameOf(*file));
+            }
+        }
+    }
+    return names;
 }
 
 void WriteTestLines() {
@@ -126,7 +154,7 @@ void WriteTestLines() {
 
 int WriteLoggingConfig(const std::string& configPath, const std::string& logFileName, const std::string& logDir) {
     const std::string folder = logDir.empty() ? DefaultLogFolder() : logDir;
-    // A folder that cannot be made shows when log4cpp opens its file.
+    // ConfigureLogging reports the file that cannot be opened where the folder cannot be made.
     (void)FileUtils::CreateDirectories(folder);
     std::FILE* file = nullptr;
     if (fopen_s(&file, configPath.c_str(), "w") != 0 || file == nullptr) {
@@ -144,6 +172,9 @@ int ConfigureLogging(const std::string& configPath) {
         log4cpp::PropertyConfigurator::configure(platform::LibraryPropertyFile(fs::path(configPath)));
         accepted = 1;
         WriteTestLines();
+        for (const std::string& name : LogFilesThatAreMissing()) {
+            std::cerr << "Logging configuration error: cannot open log file " << name << std::endl;
+        }
     } catch (const std::exception& error) {
         std::cerr << "Logging configuration error: " << error.what() << std::endl;
     } catch (...) {
@@ -185,18 +216,23 @@ void DeployCLI::InitLogging(int argc, const char* const* argv) {
     }
     const std::string fileName = LogFileFromArgs(argc, argv);
     if (!fileName.empty()) {
-        // A folder that cannot be made leaves the run without a log file; it goes on all the same. Both separators are
-        // what people type.
+        // A folder that cannot be made leaves the run without a log file, which is reported below; it goes on all the
+        // same. Both separators are what people type.
         (void)FileUtils::CreateDirectories(fs::path(fileName).parent_path().make_preferred().string());
     }
+    bool logs = true;
     for (const char* const name : kCategories) {
         log4cpp::Category& category = log4cpp::Category::getInstance(name);
         if (!fileName.empty()) {
-            AddLogFile(category, fileName);
+            logs = AddLogFile(category, fileName) && logs;
         }
         if (SetCategoryLevelFromArgs(name, argc, argv, "loglevel") == 0) {
             category.setPriority(log4cpp::Priority::DEBUG);
         }
+    }
+    if (!logs) {
+        std::cerr << "hvdeploy: cannot open log file " << fileName << "; the log goes to standard output alone"
+                  << std::endl;
     }
 }
 

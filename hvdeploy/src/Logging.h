@@ -12,7 +12,7 @@ namespace HV {
                                      const std::string& logDir);
 
 /// Hands the property file to log4cpp and writes a test line to each category. Returns 1 when log4cpp accepted the
-/// file, else 0. What went wrong stands on standard error; nothing is thrown.
+/// file, else 0. What went wrong stands on standard error, a log file that cannot be opened too; nothing is thrown.
 int ConfigureLogging(const std::string& configPath);
 
 /// Sets the priority of `categoryName` from every argument that begins with `key` and "=", so that the last one wins.

@@ -55,8 +55,8 @@ int RunWizard(HINSTANCE instance, int showCommand) {
     platform::OpenMissingStandardStreams();
     PrepareConsoleForScripts();
     const WindowSystem windows;
-    StartLogging();
     try {
+        StartLogging();
         return ShowWizard(instance, showCommand);
     } catch (const std::exception& error) {
         HVL_LOG(Emerg, "The installer ends because of an error that nothing catches: " << error.what());

@@ -36,6 +36,23 @@ TEST(LoggingOfTheProgram, WritesToTheFileWhatItPrints) {
     EXPECT_TRUE(Has(result.output, " WARN hvdeploy-detail : ListPackages not yet implemented.\n")) << result.output;
 }
 
+TEST(LoggingOfTheProgram, SaysThatTheFileCannotBeOpenedAndRunsOn) {
+    Machine machine;
+    machine.Has(R"(C:\file)", "in the way");
+    machine.HasFolder(R"(C:\folder.log)");
+    int names = 0;
+    for (const std::string name : {R"(C:\file\run.log)", R"(C:\folder.log)"}) {
+        const ProgramResult result = RunProgram("hvdeploy", {"list=packages", "log=" + name});
+        EXPECT_EQ(result.exitStatus, 0);
+        EXPECT_EQ(result.errors,
+                  "hvdeploy: cannot open log file " + name + "; the log goes to standard output alone\n");
+        EXPECT_TRUE(Has(result.output, "ListPackages not yet implemented.\n")) << result.output;
+        ++names;
+    }
+    EXPECT_EQ(names, 2);
+    EXPECT_EQ(machine.Content(R"(C:\file)"), "in the way");
+}
+
 TEST(LoggingOfTheProgram, MakesTheFoldersOfALogThatIsNamedWithSlashes) {
     const Machine machine;
     (void)RunProgram("hvdeploy", {"list=packages", "log=C:/Logs/deep/run.log"});

@@ -120,6 +120,8 @@ TEST_F(LoggingTest, RunsOnWithoutALogFileWhoseFolderCannotBeMade) {
     HVL_LOG(Info, "still here");
     EXPECT_TRUE(EndsWith(streams.Output(), " INFO hvdeploy-detail : still here\n")) << streams.Output();
     EXPECT_EQ(machine.Content(R"(C:\file)"), "in the way");
+    EXPECT_EQ(streams.Errors(),
+              "hvdeploy: cannot open log file C:\\file\\run.log; the log goes to standard output alone\n");
 }
 
 TEST_F(LoggingTest, TakesTheFirstOfTwoLogFiles) {

@@ -215,7 +215,28 @@ TEST_F(StartLoggingTest, GoesOnWhereTheLogFolderCannotBeMade) {
     Start();
     EXPECT_EQ(machine.Content(GeneratedFile()), GeneratedText(kDefaultLog));
     EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn)"), "in the way");
+    EXPECT_EQ(CountOf("Logging configuration error: cannot open log file ", errors), 2U) << errors;
+    EXPECT_EQ(CountOf("Tessaly Suite Installer.log\n", errors), 2U) << errors;
     ExpectEverythingIsLogged();
+}
+
+TEST_F(StartLoggingTest, ReportsEveryLogFileThatCannotBeOpenedAndWritesTheOthers) {
+    machine.HasFolder(R"(C:\Own)");
+    machine.HasFolder(R"(C:\Own\folder.log)");
+    machine.Has(kPropertyFile, OwnProperties("INFO") +
+                                   "log4cpp.category.halvorn=INFO, folder, rolling\n"
+                                   "log4cpp.category.hvdeploy-detail=INFO, folder\n"
+                                   "log4cpp.appender.folder=FileAppender\n"
+                                   "log4cpp.appender.folder.fileName=C:\\Own\\folder.log\n"
+                                   "log4cpp.appender.folder.layout=BasicLayout\n"
+                                   "log4cpp.appender.rolling=RollingFileAppender\n"
+                                   "log4cpp.appender.rolling.fileName=C:\\None\\rolling.log\n"
+                                   "log4cpp.appender.rolling.layout=BasicLayout\n");
+    Start();
+    EXPECT_EQ(CountOf("Logging configuration error: cannot open log file ", errors), 4U) << errors;
+    EXPECT_EQ(CountOf("folder.log\n", errors), 2U) << errors;
+    EXPECT_EQ(CountOf("rolling.log\n", errors), 2U) << errors;
+    EXPECT_EQ(machine.Content(R"(C:\Own\own.log)"), "DEBUG hvdeploy-detail: a line;DEBUG halvorn: another;");
 }
 
 TEST_F(StartLoggingTest, GoesOnWhereTheTemporaryFolderCannotBeMade) {
