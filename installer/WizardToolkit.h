@@ -9,7 +9,7 @@
 ///
 /// The controller decides what happens; a toolkit shows it. So the controller runs with any toolkit, a scripted one
 /// among them. Windows and pages are named by pointers that the toolkit gives out and the controller only hands back:
-/// it never looks into them.
+/// it never looks into them. Texts are UTF-8 and show exactly their characters.
 namespace HV {
 
 class EULAWindowController;

@@ -41,6 +41,15 @@ unsigned FaceOf(const CustomButton& button, bool enabled) {
     return button.highlighted ? WizardMetrics::HighlightColor : WizardMetrics::FaceColor;
 }
 
+// In the text of a control an ampersand makes the letter after it a key that presses the control. Two stand for one.
+std::wstring ControlText(const std::wstring& text) {
+    std::wstring doubled;
+    for (const wchar_t letter : text) {
+        doubled.append(letter == L'&' ? 2 : 1, letter);
+    }
+    return doubled;
+}
+
 }  // namespace
 
 void CustomButton::SetText(const std::string& newText) {
@@ -50,7 +59,7 @@ void CustomButton::SetText(const std::string& newText) {
     text = newText;
     if (handle != nullptr) {
         // What the control itself is called is not painted, and is what screen readers say.
-        ::SetWindowTextW(handle, platform::WideFromUtf8(text).c_str());
+        ::SetWindowTextW(handle, ControlText(platform::WideFromUtf8(text)).c_str());
         ::InvalidateRect(handle, nullptr, TRUE);
     }
 }
@@ -68,14 +77,15 @@ void CustomButton::SetHighlighted(bool newHighlighted) {
 void MakeButton(CustomButton& button, HWND parent, const std::string& text, int identifier, const RECT& place,
                 DWORD style) {
     button.text = text;
-    button.handle = MakeButtonControl(parent, platform::WideFromUtf8(text).c_str(), identifier, place, style);
+    button.handle = MakeButtonControl(parent, platform::WideFromUtf8(text), identifier, place, style);
 }
 
-HWND MakeButtonControl(HWND parent, const wchar_t* text, int identifier, const RECT& place, DWORD style) {
+HWND MakeButtonControl(HWND parent, const std::wstring& text, int identifier, const RECT& place, DWORD style) {
     // NOLINTNEXTLINE(performance-no-int-to-ptr): where a menu would be, a control has its identifier.
     const auto menu = reinterpret_cast<HMENU>(static_cast<std::intptr_t>(identifier));
-    return ::CreateWindowExW(0, L"BUTTON", text, style, place.left, place.top, place.right - place.left,
-                             place.bottom - place.top, parent, menu, ::GetModuleHandleW(nullptr), nullptr);
+    return ::CreateWindowExW(0, L"BUTTON", ControlText(text).c_str(), style, place.left, place.top,
+                             place.right - place.left, place.bottom - place.top, parent, menu,
+                             ::GetModuleHandleW(nullptr), nullptr);
 }
 
 bool IsEnabled(const DRAWITEMSTRUCT& item) {

@@ -52,8 +52,9 @@ constexpr DWORD kDisabledButtonStyle = 0x5801000B;
 void MakeButton(CustomButton& button, HWND parent, const std::string& text, int identifier, const RECT& place,
                 DWORD style = kButtonStyle);
 
-/// Makes a control of the class "BUTTON"; `text` is what the system calls it.
-[[nodiscard]] HWND MakeButtonControl(HWND parent, const wchar_t* text, int identifier, const RECT& place, DWORD style);
+/// Makes a control of the class "BUTTON"; `text` is what the system calls it, letter for letter.
+[[nodiscard]] HWND MakeButtonControl(HWND parent, const std::wstring& text, int identifier, const RECT& place,
+                                     DWORD style);
 
 /// Whether a control that is to be drawn is enabled.
 [[nodiscard]] bool IsEnabled(const DRAWITEMSTRUCT& item);

@@ -1,8 +1,20 @@
 #include "installer/windows/Painting.h"
 
 #include "installer/windows/WizardMetrics.h"
+#include "platform/utf8.h"
 
 namespace HV {
+
+namespace {
+
+// An ampersand is a letter like any other, and what finds no room ends in three dots. Of several lines the last one
+// that fits whole gets the dots, which takes the rules of edit controls.
+unsigned AsWritten(unsigned format) {
+    constexpr unsigned kWholeLines = DT_EDITCONTROL;
+    return format | DT_NOPREFIX | DT_END_ELLIPSIS | ((format & DT_WORDBREAK) != 0 ? kWholeLines : 0);
+}
+
+}  // namespace
 
 void DrawPageText(HDC device, const std::string& text, RECT place, HFONT font, unsigned format) {
     ::SetBkColor(device, ColorOf(WizardMetrics::PageColor));
@@ -10,9 +22,10 @@ void DrawPageText(HDC device, const std::string& text, RECT place, HFONT font, u
 }
 
 void DrawColoredText(HDC device, const std::string& text, RECT place, HFONT font, unsigned format, unsigned rgb) {
+    const std::wstring wide = platform::WideFromUtf8(text);
     ::SetTextColor(device, ColorOf(rgb));
     const HGDIOBJ before = ::SelectObject(device, font);
-    ::DrawTextA(device, text.c_str(), static_cast<int>(text.size()), &place, format);
+    ::DrawTextW(device, wide.c_str(), static_cast<int>(wide.size()), &place, AsWritten(format));
     ::SelectObject(device, before);
 }
 

@@ -24,8 +24,8 @@ private:
     HDC device_;
 };
 
-/// Draws text in the wizard's text colour on its page colour. Windows takes what it draws to be in the code page of the
-/// system, whatever the program's manifest says, so letters beyond ASCII are right only where that is UTF-8.
+/// Draws text, which is UTF-8, in the wizard's text colour on its page colour: exactly its characters, ampersands
+/// included. What finds no room in `place` ends in an ellipsis. `format` is that of the platform's DrawText.
 void DrawPageText(HDC device, const std::string& text, RECT place, HFONT font, unsigned format);
 
 /// The same in a colour of its own, on a background that shows through or is painted, as the device is set.

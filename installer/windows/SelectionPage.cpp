@@ -1,10 +1,10 @@
 #include "installer/windows/SelectionPage.h"
 
 #include <algorithm>
-#include <array>
 
 #include "installer/windows/Painting.h"
 #include "installer/windows/WizardMetrics.h"
+#include "platform/utf8.h"
 
 namespace HV {
 
@@ -15,16 +15,17 @@ constexpr int kBoxOn = 131;
 constexpr int kPictureTop = 4;
 constexpr DWORD kCheckStyle = 0x5001010B;
 constexpr DWORD kDisabledCheckStyle = 0x5801010B;
-constexpr int kTextUnits = 256;
+constexpr std::size_t kLongestControlName = 255;
 constexpr unsigned kLabelFormat = DT_VCENTER | DT_SINGLELINE;
 constexpr UINT kAtOnce = RDW_INVALIDATE | RDW_ERASE | RDW_UPDATENOW;
 
-// What the system calls a check box. A name that is too long for the buffer is cut here; what is painted is whole.
-std::array<wchar_t, kTextUnits> ControlText(const std::string& displayName) {
-    std::array<wchar_t, kTextUnits> text{};
-    ::MultiByteToWideChar(CP_UTF8, 0, displayName.c_str(), -1, text.data(), kTextUnits);
-    text.back() = L'\0';
-    return text;
+// What the system calls a check box: at most this much of the product's name, and no half character.
+std::wstring ControlName(const std::string& displayName) {
+    std::wstring name = platform::WideFromUtf8(displayName).substr(0, kLongestControlName);
+    if (!name.empty() && IS_HIGH_SURROGATE(name.back())) {
+        name.pop_back();
+    }
+    return name;
 }
 
 void SendCheck(HWND control, bool checked) {
@@ -107,7 +108,7 @@ void SelectionPage::MakeCheckButton(std::size_t index, const Place& place) {
     button.checked = item.checked;
     button.background = WizardMetrics::Instance().PageBrush;
     button.handle = MakeButtonControl(
-        m_hWnd, ControlText(item.displayName).data(), kFirstCheckControl + static_cast<int>(index),
+        m_hWnd, ControlName(item.displayName), kFirstCheckControl + static_cast<int>(index),
         {place.left, place.top, place.right, place.bottom}, item.enabled ? kCheckStyle : kDisabledCheckStyle);
     SendCheck(button.handle, item.checked);
     checkButtons_.push_back(button);

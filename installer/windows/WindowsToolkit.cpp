@@ -11,6 +11,7 @@
 #include "installer/windows/SelectionPage.h"
 #include "installer/windows/WelcomePage.h"
 #include "installer/windows/WizardMetrics.h"
+#include "platform/utf8.h"
 
 namespace HV {
 
@@ -178,7 +179,8 @@ void WindowsToolkit::MessageBeep(unsigned type) {
 
 int WindowsToolkit::MessageBoxA(InstallerWindow* owner, const std::string& text, const std::string& title,
                                 unsigned type) {
-    return ::MessageBoxA(HandleOfWindow(owner), text.c_str(), title.c_str(), type);
+    return ::MessageBoxW(HandleOfWindow(owner), platform::WideFromUtf8(text).c_str(),
+                         platform::WideFromUtf8(title).c_str(), type);
 }
 
 void WindowsToolkit::SetTimer(InstallerWindow& window, unsigned timer, unsigned milliseconds) {

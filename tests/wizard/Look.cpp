@@ -48,6 +48,12 @@ Mark Words(const std::string& text, const RECT& part, Font font, unsigned format
         }};
 }
 
+Mark WordsInOneLine(const std::string& text, const RECT& part, Font font, unsigned format, Color color,
+                    Color background) {
+    const auto width = static_cast<int>(part.right - part.left);
+    return Words(Picture::Shortened(text, width, font.height, font.weight), part, font, format, color, background);
+}
+
 Mark Image(const std::string& hostPath, int left, int top) {
     const Picture image = Picture::OfFile(hostPath);
     const RECT part{left, top, left + image.Width(), top + image.Height()};
@@ -72,8 +78,8 @@ Mark Button(const std::string& text, const RECT& part, Color face, Color behind)
 Mark CheckBox(const std::string& text, const RECT& part, bool checked, bool enabled) {
     const Mark box = Image(std::string(HV_RESOURCES) + (checked ? "/checkbox-on.bmp" : "/checkbox-off.bmp"), part.left,
                            part.top + 4);
-    const Mark label = Words(text, {part.left + 24, part.top, part.right, part.bottom}, Body, OneLineCentred,
-                             enabled ? Text : DisabledText, Page);
+    const Mark label = WordsInOneLine(text, {part.left + 24, part.top, part.right, part.bottom}, Body, OneLineCentred,
+                                      enabled ? Text : DisabledText, Page);
     return {box.description + " and " + label.description, [=](const Picture& picture) {
                 return box.isIn(picture) && label.isIn(picture) &&
                        picture.IsAll({part.left, part.top, part.right, part.top + 4}, Page);

@@ -31,7 +31,7 @@ constexpr Font Body{13, 300};
 constexpr Font Strong{13, 600};
 constexpr Font Wait{16, 300};
 
-/// Formats of DrawTextA.
+/// Formats of DrawTextW.
 constexpr unsigned Wrapped = 16;
 constexpr unsigned OneLine = 32;
 constexpr unsigned OneLineCentred = 36;
@@ -49,6 +49,10 @@ Mark Filled(const RECT& part, Color color);
 
 /// The rectangle holds this text and nothing else, letter for letter.
 Mark Words(const std::string& text, const RECT& part, Font font, unsigned format, Color color, Color background);
+
+/// The rectangle holds as much of this text as one line has room for, and three dots behind it.
+Mark WordsInOneLine(const std::string& text, const RECT& part, Font font, unsigned format, Color color,
+                    Color background);
 
 /// The bitmap stands at this point, at its own size.
 Mark Image(const std::string& hostPath, int left, int top);

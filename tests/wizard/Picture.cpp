@@ -9,6 +9,46 @@ namespace {
 
 constexpr Color kNoColor = 0xFF000000;
 
+std::wstring Wide(const std::string& text) {
+    std::wstring wide(text.size(), L'\0');
+    wide.resize(static_cast<std::size_t>(MultiByteToWideChar(CP_UTF8, MB_ERR_INVALID_CHARS, text.data(),
+                                                             static_cast<int>(text.size()), wide.data(),
+                                                             static_cast<int>(wide.size()))));
+    return wide;
+}
+
+std::string Narrow(const std::wstring& wide) {
+    std::string text(wide.size() * 3, '\0');
+    text.resize(
+        static_cast<std::size_t>(WideCharToMultiByte(CP_UTF8, 0, wide.data(), static_cast<int>(wide.size()),
+                                                     text.data(), static_cast<int>(text.size()), nullptr, nullptr)));
+    return text;
+}
+
+/// The font of the wizard, chosen into a device context for as long as this lives.
+class ChosenFont {
+public:
+    ChosenFont(HDC context, int height, int weight) : context_(context) {
+        LOGFONTA description{};
+        description.lfHeight = height;
+        description.lfWeight = weight;
+        std::strcpy(description.lfFaceName, "Tahoma");
+        font_ = CreateFontIndirectA(&description);
+        before_ = SelectObject(context_, font_);
+    }
+    ~ChosenFont() {
+        SelectObject(context_, before_);
+        DeleteObject(font_);
+    }
+    ChosenFont(const ChosenFont&) = delete;
+    ChosenFont& operator=(const ChosenFont&) = delete;
+
+private:
+    HDC context_;
+    HFONT font_;
+    HGDIOBJ before_;
+};
+
 COLORREF Ref(Color color) {
     return RGB(color >> 16 & 0xFF, color >> 8 & 0xFF, color & 0xFF);
 }
@@ -136,18 +176,32 @@ bool Picture::Holds(const Picture& other, const RECT& part) const {
 void Picture::Write(const std::string& text, RECT part, int height, int weight, unsigned format, Color color) {
     const Canvas canvas(width_, height_);
     canvas.Take(colors_);
-    LOGFONTA description{};
-    description.lfHeight = height;
-    description.lfWeight = weight;
-    std::strcpy(description.lfFaceName, "Tahoma");
-    const HFONT font = CreateFontIndirectA(&description);
-    const HGDIOBJ before = SelectObject(canvas.Context(), font);
-    SetTextColor(canvas.Context(), Ref(color));
-    SetBkMode(canvas.Context(), TRANSPARENT);
-    DrawTextA(canvas.Context(), text.c_str(), static_cast<int>(text.size()), &part, format);
-    SelectObject(canvas.Context(), before);
-    DeleteObject(font);
+    {
+        const ChosenFont font(canvas.Context(), height, weight);
+        const std::wstring wide = Wide(text);
+        SetTextColor(canvas.Context(), Ref(color));
+        SetBkMode(canvas.Context(), TRANSPARENT);
+        DrawTextW(canvas.Context(), wide.c_str(), static_cast<int>(wide.size()), &part, format | DT_NOPREFIX);
+    }
     canvas.Give(colors_);
+}
+
+std::string Picture::Shortened(const std::string& text, int width, int height, int weight) {
+    const Canvas canvas(1, 1);
+    const ChosenFont font(canvas.Context(), height, weight);
+    const auto fits = [&](const std::wstring& line) {
+        SIZE size{};
+        GetTextExtentPoint32W(canvas.Context(), line.c_str(), static_cast<int>(line.size()), &size);
+        return size.cx <= width;
+    };
+    std::wstring kept = Wide(text);
+    if (fits(kept)) {
+        return text;
+    }
+    while (!kept.empty() && !fits(kept + L"...")) {
+        kept.pop_back();
+    }
+    return Narrow(kept + L"...");
 }
 
 void Picture::Save(const std::string& path) const {

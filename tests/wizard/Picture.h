@@ -31,9 +31,12 @@ public:
     /// Whether `part` of this picture holds exactly this other picture, which starts at its corner.
     [[nodiscard]] bool Holds(const Picture& other, const RECT& part) const;
 
-    /// Writes text as the wizard writes it: in Tahoma (or what stands for it), with this height and weight, by this
-    /// format of DrawTextA, onto what is there.
+    /// Writes text, which is UTF-8, as the wizard writes it: in Tahoma (or what stands for it), with this height and
+    /// weight, by this format of DrawTextW, every character as it stands, onto what is there.
     void Write(const std::string& text, RECT part, int height, int weight, unsigned format, Color color);
+
+    /// As much of the text as a line of this width has room for, and three dots where that is not all of it.
+    static std::string Shortened(const std::string& text, int width, int height, int weight);
 
     /// Writes a bitmap file.
     void Save(const std::string& path) const;

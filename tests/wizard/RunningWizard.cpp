@@ -42,12 +42,15 @@ bool Eventually(const std::function<bool()>& question) {
 }
 
 std::string TextOf(HWND window) {
-    std::string text(4096, '\0');
+    std::wstring wide(4096, L'\0');
     DWORD_PTR length = 0;
     // Asked of the window itself: a control's own text is not to be had otherwise from another process.
-    SendMessageTimeoutA(window, WM_GETTEXT, text.size(), reinterpret_cast<LPARAM>(text.data()), SMTO_NORMAL, kMinute,
+    SendMessageTimeoutW(window, WM_GETTEXT, wide.size(), reinterpret_cast<LPARAM>(wide.data()), SMTO_NORMAL, kMinute,
                         &length);
-    text.resize(length);
+    std::string text(length * 3, '\0');
+    text.resize(
+        static_cast<std::size_t>(WideCharToMultiByte(CP_UTF8, 0, wide.data(), static_cast<int>(length), text.data(),
+                                                     static_cast<int>(text.size()), nullptr, nullptr)));
     return text;
 }
 

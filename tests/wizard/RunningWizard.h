@@ -97,6 +97,7 @@ private:
     HWND window_ = nullptr;
 };
 
+/// In UTF-8.
 std::string TextOf(HWND window);
 std::string ClassOf(HWND window);
 /// Outer rectangle on the screen, and the part of a parent's client area that a child takes.
