@@ -62,3 +62,32 @@ TEST(Agreement, NumbersItsSectionsFromOneToEleven) {
     }
     EXPECT_EQ(sections, 11);
 }
+
+TEST(Agreement, SetsTheLeadInsOfItsClausesInBold) {
+    const std::string document = ResourceFile("agreement.rtf");
+    int leadIns = 0;
+    for (const char* leadIn : {"License.", "Computers.", "Rendering.", "Copies.", "Your work stays yours."}) {
+        const std::string bold = "\\tab \\b " + std::string(leadIn) + "\\b0  ";
+        EXPECT_NE(document.find(bold), std::string::npos) << leadIn;
+        ++leadIns;
+    }
+    EXPECT_EQ(leadIns, 5);
+    EXPECT_EQ(document.find('*'), std::string::npos) << "a mark of the text's own form is left";
+}
+
+TEST(Agreement, SetsItsLastLineApart) {
+    const std::string document = ResourceFile("agreement.rtf");
+    const std::size_t last = document.rfind("\\pard");
+    EXPECT_EQ(document.substr(last), "\\pard\\sb240\\sa120 \\'a9 2026 Halvorn LLC. All rights reserved.\\par}");
+}
+
+// The wizard's process is gone before the way back is finished.
+TEST(Agreement, PromisesNothingForACancelAndSaysWhereReplacedFilesLie) {
+    const std::string document = ResourceFile("agreement.rtf");
+    const std::size_t clause = document.find("3.2\\tab ");
+    ASSERT_NE(clause, std::string::npos);
+    const std::string words = document.substr(clause, document.find("\\par", clause) - clause);
+    EXPECT_EQ(words.find("fails or is cancelled"), std::string::npos) << words;
+    EXPECT_NE(words.find("may put back nothing"), std::string::npos) << words;
+    EXPECT_NE(words.find("\\ldblquote hvdeploystash\\rdblquote , in the temporary folder"), std::string::npos) << words;
+}

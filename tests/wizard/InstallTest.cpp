@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <filesystem>
 #include <map>
 
 #include "tests/support/Link.h"
@@ -13,6 +14,14 @@ struct Left {
     std::string registry;
     bool operator==(const Left&) const = default;
 };
+
+std::vector<std::string> NamesIn(const std::string& folder) {
+    std::vector<std::string> names;
+    for (const auto& entry : std::filesystem::directory_iterator(folder)) {
+        names.push_back(entry.path().filename().string());
+    }
+    return names;
+}
 
 class InstallTest : public WizardTest {
 protected:
@@ -210,6 +219,34 @@ TEST_F(InstallTest, EndsAtOnceWhenCancelledInTheMiddle) {
     EXPECT_TRUE(machine().HasFile(R"(C:\hold.txt)"));
     LetGo();
     EXPECT_FALSE(IsRegistered());
+}
+
+// The way back is cut off. What was there before lies where the documents say.
+TEST_F(InstallTest, LeavesWhatItReplacedInTheStashWhenCancelled) {
+    HasEveryHost();
+    const std::string library = R"(C:\Program Files\Halvorn\Tessaly\Libraries\TessalyColor.dll)";
+    machine().Has(library, "the old one");
+    HoldAtScript("requirements");
+    {
+        RunningWizard wizard(folder);
+        GoToInstalling(wizard);
+        WaitUntilHeld();
+        wizard.Press(wizard.Window(), id::Cancel);
+        EXPECT_EQ(wizard.ExitStatus(), 0U);
+    }
+    LetGo();
+    EXPECT_NE(machine().Content(library), "the old one");
+    std::vector<std::string> stashed;
+    for (const std::string& entry : machine().TempEntries()) {
+        if (entry.rfind("hvdeploystash", 0) == 0) {
+            stashed = NamesIn(machine().TempFolder() + "\\" + entry);
+            ASSERT_EQ(stashed.size(), 1U);
+            EXPECT_EQ(machine().Content(machine().TempFolder() + "\\" + entry + "\\" + stashed.front()), "the old one");
+        }
+    }
+    ASSERT_EQ(stashed.size(), 1U);
+    EXPECT_EQ(stashed.front().rfind("TessalyColor.dll", 0), 0U) << stashed.front();
+    EXPECT_EQ(stashed.front().size(), std::string("TessalyColor.dll").size() + 36);
 }
 
 TEST_F(InstallTest, EndsWhenCancelledBeforeItsFirstStep) {
