@@ -40,6 +40,11 @@ void ExpectPlainBitmap(const std::string& name, std::uint32_t width, std::uint32
     EXPECT_EQ(bitmap.bytes.size(), kHeaders + bitmap.RowSize() * height);
 }
 
+/// How bright the eye takes a colour to be, from 0 to 255: green counts most.
+constexpr double Brightness(std::uint32_t color) {
+    return 0.2126 * (color >> 16 & 0xFF) + 0.7152 * (color >> 8 & 0xFF) + 0.0722 * (color & 0xFF);
+}
+
 void ExpectCornersInPageColor(const std::string& name) {
     SCOPED_TRACE(name);
     const Bitmap box(name);
@@ -87,6 +92,31 @@ TEST(Pictures, TheMarkStandsStillWhenTheFinalPictureCoversTheBanner) {
     }
     EXPECT_EQ(compared, 4800U);
     EXPECT_EQ(different, 0U);
+}
+
+// A release of any suite shows this picture, also after a run that could not replace a file.
+TEST(Pictures, TheFinalPictureNamesNoSuiteAndPromisesNothing) {
+    const std::string source = ResourceFile("art/final.svg");
+    EXPECT_NE(source.find("<text "), std::string::npos);
+    EXPECT_EQ(source.find("Tessaly"), std::string::npos);
+    EXPECT_EQ(source.find("in place"), std::string::npos);
+    EXPECT_EQ(source.find("complete"), std::string::npos);
+}
+
+// The one button that is lit says where to go on; what is warm in the banner stays behind it.
+TEST(Pictures, TheBannersAmberIsQuieterThanTheLitButton) {
+    constexpr double kLitButton = Brightness(0x009FE1);
+    const Bitmap banner("banner.bmp");
+    std::size_t amber = 0;
+    for (std::size_t y = 0; y < banner.Height(); ++y) {
+        for (std::size_t x = 0; x < banner.Width(); ++x) {
+            const std::uint32_t color = banner.Pixel(x, y);
+            const bool isWarm = (color >> 16) > (color & 0xFF) + 16;
+            amber += isWarm ? 1U : 0U;
+            ASSERT_FALSE(isWarm && Brightness(color) > kLitButton * 3 / 4) << x << ", " << y;
+        }
+    }
+    EXPECT_GT(amber, 500U) << "the last tile is to be seen";
 }
 
 TEST(Pictures, TheIconHasSixSizesOfFullColor) {
