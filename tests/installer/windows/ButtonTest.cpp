@@ -260,6 +260,13 @@ TEST_F(ButtonControlTest, IsCalledByItsText) {
     EXPECT_EQ(ControlsOf(Parent()).at(0).text, L"Install");
 }
 
+// A single ampersand would make a key of the letter after it.
+TEST_F(ButtonControlTest, IsCalledByItsTextWithItsAmpersandsDoubled) {
+    button.SetText("R&D & more – é™");
+    EXPECT_EQ(ControlsOf(Parent()).at(0).text, L"R&&D && more – é™");
+    EXPECT_EQ(button.text, "R&D & more – é™");
+}
+
 TEST_F(ButtonControlTest, IsPaintedAgainWhenTheHighlightChanges) {
     Settle();
     button.SetHighlighted(false);
