@@ -13,11 +13,18 @@ set(lib ${made}/lib)
 # On the distribution's side of the fence: header and library of the cross-compiler itself.
 hv_third_party(zlib LINKS z)
 
+# Of the system's own, those that are loaded when they are called first, and what is called of them.
+hv_delayed_library(bcrypt bcrypt.dll BCryptCloseAlgorithmProvider BCryptGenRandom BCryptOpenAlgorithmProvider)
+hv_delayed_library(comctl32 COMCTL32.dll InitCommonControlsEx)
+# Windows keeps this one loaded, but it brings the common controls along, and these the look of windows.
+hv_delayed_library(comdlg32 comdlg32.dll GetSaveFileNameW)
+hv_delayed_library(version VERSION.dll GetFileVersionInfoA GetFileVersionInfoSizeA VerQueryValueA)
+
 set(boost_defines BOOST_ALL_NO_LIB BOOST_FILESYSTEM_STATIC_LINK BOOST_THREAD_USE_LIB BOOST_CHRONO_STATIC_LINK)
 hv_third_party(boost_filesystem INCLUDES ${include} DEFINES ${boost_defines}
-    LINKS ${lib}/libboost_filesystem.a bcrypt ole32 oleaut32 uuid)
+    LINKS ${lib}/libboost_filesystem.a third::bcrypt ole32 oleaut32 uuid)
 hv_third_party(boost_thread INCLUDES ${include} DEFINES ${boost_defines}
-    LINKS ${lib}/libboost_thread.a ${lib}/libboost_chrono.a Threads::Threads bcrypt)
+    LINKS ${lib}/libboost_thread.a ${lib}/libboost_chrono.a Threads::Threads third::bcrypt)
 
 # The library is compiled with the same definitions; scripts/windows-libraries has its half.
 hv_third_party(log4cpp INCLUDES ${include}
