@@ -3,6 +3,7 @@
 #include <picojson.h>
 
 #include <cstdlib>
+#include <stdexcept>
 #include <string_view>
 
 #include "hvframework/StringUtils.h"
@@ -52,6 +53,15 @@ bool NestsTooDeep(const std::string& json) {
     return false;
 }
 
+/// Whether `json` is JSON, as `document`. The library throws without a word for a number that no double can hold.
+bool Parse(const std::string& json, picojson::value& document) {
+    try {
+        return picojson::parse(document, json).empty();
+    } catch (const std::overflow_error&) {
+        throw std::overflow_error("a number is too large to be read");
+    }
+}
+
 }  // namespace
 
 bool ProductData::operator<(const ProductData& other) const {
@@ -66,7 +76,7 @@ bool ProductData::operator<(const ProductData& other) const {
 
 bool ProductData::ReadJSON(const std::string& json) {
     picojson::value document;
-    if (NestsTooDeep(json) || !picojson::parse(document, json).empty()) {
+    if (NestsTooDeep(json) || !Parse(json, document)) {
         return false;
     }
     // The accessors throw on a value of another kind; the caller deals with that.

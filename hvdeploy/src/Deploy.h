@@ -120,6 +120,7 @@ private:
     void ReadSuiteInfo(const FolderContent& content);
     bool ReadSuiteFile(const fs::path& suitePath);
     bool AcceptSuiteText(const std::string& text, const fs::path& suitePath);
+    bool ReadSuiteText(const std::string& text, const fs::path& suitePath);
     bool IsSuite(const fs::path& suitePath) const;
     EngineResult RunPreflightPhase(const std::vector<fs::path>& packages);
     EngineResult RunMainPhases(const FolderContent& content);

@@ -159,11 +159,21 @@ bool Deploy::ReadSuiteFile(const fs::path& suitePath) {
 }
 
 bool Deploy::AcceptSuiteText(const std::string& text, const fs::path& suitePath) {
-    if (!suiteInfo.ReadJSON(text)) {
+    if (!ReadSuiteText(text, suitePath)) {
         HVL_LOG(Warn, "failed to read suite data from file " << suitePath);
         return false;
     }
     return IsSuite(suitePath);
+}
+
+// An exception ends the run, and what it says itself may be the library's own words alone: the file is named here.
+bool Deploy::ReadSuiteText(const std::string& text, const fs::path& suitePath) {
+    try {
+        return suiteInfo.ReadJSON(text);
+    } catch (const std::exception& error) {
+        HVL_LOG(Error, "cannot take suite data from file " << suitePath << ": " << error.what());
+        throw;
+    }
 }
 
 bool Deploy::IsSuite(const fs::path& suitePath) const {

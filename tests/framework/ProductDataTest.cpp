@@ -136,7 +136,12 @@ TEST(ProductData, ThrowsWhenAnInstalledPathIsNoString) {
 
 TEST(ProductData, ThrowsForANumberThatNoDoubleHolds) {
     ProductData product;
-    EXPECT_THROW((void)product.ReadJSON(R"({"size": 1e999})"), std::runtime_error);
+    try {
+        (void)product.ReadJSON(R"({"size": 1e999})");
+        FAIL() << "nothing was thrown";
+    } catch (const std::runtime_error& error) {
+        EXPECT_STREQ(error.what(), "a number is too large to be read");
+    }
 }
 
 TEST(ProductData, AddsASecondReadingToTheFirst) {

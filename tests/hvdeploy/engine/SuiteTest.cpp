@@ -78,6 +78,18 @@ TEST_F(SuiteTest, LeavesATextThatIsNoObjectToTheCaller) {
     EXPECT_THROW((void)RunWith("[1, 2]"), std::runtime_error);
 }
 
+TEST_F(SuiteTest, NamesTheFileAndTheReasonWhenItsTextEndsTheRun) {
+    EXPECT_THROW((void)RunWith(R"({"product_type": "0", "size": 1e999})"), std::overflow_error);
+    EXPECT_TRUE(log.Has(
+        ErrorLine(R"(cannot take suite data from file "C:\Packages\suite.json": a number is too large to be read)")))
+        << log.Text();
+    log.Clear();
+    EXPECT_THROW((void)RunWith("[1, 2]"), std::runtime_error);
+    EXPECT_EQ(log.LinesStartingWith(ErrorLine(R"(cannot take suite data from file "C:\Packages\suite.json": )")).size(),
+              1U)
+        << log.Text();
+}
+
 TEST_F(SuiteTest, WarnsWithAnEmptyPathWhenThereIsNoSuiteFile) {
     machine.HasFolder(kPackages);
     EXPECT_EQ(InstallFolder(), 0);
@@ -123,6 +135,14 @@ TEST_F(SuiteTest, LetsTheFirstPackageThatNamesASuiteDecide) {
 TEST_F(SuiteTest, PassesOverAPackageThatCannotBeOpened) {
     const fs::path good = OfSuite("glow", "com.halvorn.tessaly", "3.1", "Tessaly").WriteTo(kPackages);
     EXPECT_TRUE(engine.SynthesizeSuiteInfoFromProducts({fs::path(R"(C:\Packages\missing.hvpkg)"), good}, text));
+}
+
+TEST_F(SuiteTest, AsksAPackageForItsMetadataAlone) {
+    ASSERT_TRUE(Synthesize({OfSuite("glow", "com.halvorn.tessaly", "3.1", "Tessaly")
+                                .Payload("resource")
+                                .To("programdata")
+                                .Source("missing.dll")}));
+    EXPECT_EQ(log.LinesStartingWith("ERROR"), std::vector<std::string>{});
 }
 
 TEST_F(SuiteTest, FindsNoSuiteWhereNoPackageNamesOne) {
