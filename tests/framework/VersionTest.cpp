@@ -131,6 +131,7 @@ TEST(Version, TakesTheLastNumberForTheShortPatch) {
     EXPECT_EQ(ShortPartsOf("7.1.2"), (ShortParts{7, 1, 2}));
     EXPECT_EQ(ShortPartsOf("7.1.2.3"), (ShortParts{7, 1, 3}));
     EXPECT_EQ(ShortPartsOf("1.2.3.4"), (ShortParts{1, 2, 4}));
+    EXPECT_EQ(ShortPartsOf("1..5"), (ShortParts{1, 0, 5}));
     EXPECT_EQ(PartsOf("1.2.3.4")[2], 3);
 }
 

@@ -147,6 +147,16 @@ TEST_F(LoggingTest, AddsNoFileForALoneDoubleQuote) {
     EXPECT_EQ(AppendersOf(HVL::Log::Detail()), 1U);
 }
 
+TEST_F(LoggingTest, TakesAClosingQuoteAwayOnlyWithAnOpeningOne) {
+    Init({"./hvdeploy", "log=\"C:\\Logs\\opened.log"});
+    Reset();
+    EXPECT_TRUE(machine.HasFile(R"(C:\Logs\opened.log)"));
+    // A name that Windows refuses, and not the one without its last character.
+    Init({"./hvdeploy", "log=C:\\Logs\\closed.log\""});
+    Reset();
+    EXPECT_FALSE(machine.Exists(R"(C:\Logs\closed.log)"));
+}
+
 TEST_F(LoggingTest, AddsNoFileForWhiteSpace) {
     Init({"./hvdeploy", "log= \t\r\n\v\f"});
     EXPECT_EQ(AppendersOf(HVL::Log::Detail()), 1U);

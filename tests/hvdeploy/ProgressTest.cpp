@@ -212,6 +212,14 @@ TEST_F(ProgressTest, SpendsTheShareOfASkippedPackageAtOnce) {
                                                      {100, "Installation complete.", 0}}));
 }
 
+TEST_F(ProgressTest, SaysNothingOfASkippedPackageThatHasNoPoints) {
+    machine.Has(R"(C:\ProgramData\Halvorn\.hvdeploy\history\com.halvorn.glow_v9.0_hvmanifest.xml)", "newer");
+    ASSERT_EQ(engine.DeployPackages({Product("glow", 1000).WriteTo(R"(C:\Packages)")}), 0) << log.Text();
+    EXPECT_EQ(listener.reports, (std::vector<Report>{{1, "Installing packages...", 0},
+                                                     {1, "Verifying installation...", 0},
+                                                     {1, "Checking product dependencies...", 0}}));
+}
+
 TEST_F(ProgressTest, StaysAtOneForASingleFile) {
     ASSERT_EQ(engine.DeployPackages({Product("glow", 1000).WriteTo(R"(C:\Packages)")}), 1) << log.Text();
     EXPECT_EQ(listener.reports, (std::vector<Report>{{1, "Installing packages...", 0},

@@ -46,6 +46,21 @@ TEST_F(UninstallHandOverTest, NamesEveryFileAndShortcutOfThePackage) {
                                                 RegistryOnDisk("Tessaly Suite v3.1"));
 }
 
+TEST_F(UninstallHandOverTest, AsksPayloadsOfAnotherSystemToo) {
+    machine.Has(R"(C:\Packages\suite.json)", kTessalyFile);
+    (void)PackageBuilder("com.halvorn.glow")
+        .Version("2.0")
+        .Payload("resource")
+        .To("programdata", "Halvorn")
+        .File("Glow.exe", "program")
+        .Payload("plugin")
+        .Os("mac")
+        .File("Glow.plugin", "for another system")
+        .WriteTo(kFolder);
+    EXPECT_FALSE(HV::IsFailure(DeployFolder())) << log.Text();
+    EXPECT_TRUE(machine.HasFile(kScriptPath)) << log.Text();
+}
+
 TEST_F(UninstallHandOverTest, EntersTheSuiteInTheListOfInstalledPrograms) {
     machine.Has(R"(C:\Packages\suite.json)", kTessalyFile);
     (void)Glow().WriteTo(kFolder);

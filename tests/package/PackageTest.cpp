@@ -133,6 +133,12 @@ TEST_F(PackageTest, AManifestMayHaveAnyNameThatEndsRight) {
     EXPECT_TRUE(Validate());
 }
 
+TEST_F(PackageTest, ABackslashInANameMakesNoFolderOfIt) {
+    const std::string manifest = package.Manifest();
+    package.WithoutManifest().RawEntry("sub\\_hvmanifest.xml", manifest);
+    EXPECT_TRUE(Validate()) << log.Text();
+}
+
 TEST_F(PackageTest, WithItsManifestInAFolderIsNotValid) {
     package.WithoutManifest().RawEntry("folder/_hvmanifest.xml", package.Manifest());
     EXPECT_FALSE(Validate());

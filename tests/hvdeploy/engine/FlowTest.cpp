@@ -281,6 +281,22 @@ TEST_F(FlowTest, AsksForDependenciesPhaseByPhase) {
     EXPECT_FALSE(HasRolledBack());
 }
 
+TEST_F(FlowTest, AsksPackagesOfAnEarlierPhaseForTheirDependenciesNoMore) {
+    Ships(Placing("runtime").DependsOn("com.halvorn.core").Named("preflight-runtime.hvpkg"));
+    Ships(Placing("core").Named("preflight-core.hvpkg"));
+    Ships(Placing("glow"));
+    EXPECT_EQ(InstallFolder(), 0) << log.Text();
+    EXPECT_EQ(log.LinesStartingWith("ERROR"), Texts{});
+    EXPECT_TRUE(machine.HasFile(Placed("glow")));
+}
+
+TEST_F(FlowTest, CountsTheBytesOfEachFolderAnew) {
+    Ships(Placing("glow"));
+    EXPECT_EQ(InstallFolder(), 0);
+    EXPECT_EQ(InstallFolder(), 0);
+    EXPECT_EQ(engine.PackageProgressPoints(fs::path(R"(C:\Packages\com.halvorn.glow.hvpkg)")), 90.0F);
+}
+
 TEST_F(FlowTest, CountsSkippedPackagesInTheTotal) {
     Ships(TwoPayloads("preflight-glow.hvpkg"));
     Ships(TwoPayloads("glow.hvpkg"));
@@ -298,6 +314,18 @@ TEST_F(FlowTest, CancelBeforeTheFirstPackageUndoesAnEmptyStash) {
     EXPECT_TRUE(HasRolledBack());
     EXPECT_EQ(listener.reports,
               (Texts{"1 Preparing to install...", "1 Installing packages...", "1 Cancelling install..."}));
+}
+
+TEST_F(FlowTest, CancelAfterALastPackageThatWasSkippedVerifiesNothing) {
+    listener.onReport = [this](std::size_t) {
+        if (listener.reports.back() == "92 Installing packages...") {
+            engine.Cancel();
+        }
+    };
+    Ships(Placing("glow"));
+    EXPECT_EQ(InstallFolder({"com.halvorn.glow"}), 0);
+    EXPECT_TRUE(HasReported("92 Cancelling install...")) << log.Text();
+    EXPECT_FALSE(HasReported("92 Verifying installation..."));
 }
 
 TEST_F(FlowTest, CancelAfterTheLastPackageReportsItAndKeepsTheResult) {
