@@ -79,6 +79,7 @@ void DeployRollback::Rollback() {
     TraceEntry("HV::DeployRollback::", "Rollback");
     RemoveInstalledFiles();
     RestoreStashedFiles();
+    rolledBack = true;
 }
 
 void DeployRollback::RemoveInstalledFiles() {

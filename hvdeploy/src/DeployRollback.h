@@ -37,6 +37,11 @@ public:
     /// Removes all that was installed, then puts back all that was stashed. Goes on past every failure.
     void Rollback();
 
+    /// Whether anything was reported as placed.
+    bool HasInstalledFiles() const { return !installedFiles.empty(); }
+    /// Whether Rollback() has run.
+    bool HasRolledBack() const { return rolledBack; }
+
     /// Whether the run was asked to talk on standard output. The front end sets it on the engine and on the stash
     /// alike; the stash has nothing to say there so far.
     void SetVerbose(bool on) { verbose = on; }
@@ -56,6 +61,7 @@ private:
     std::vector<std::pair<fs::path, fs::path>> stashedFiles;  // original place, place in the stash
     fs::path stashDir;
     std::map<std::string, std::map<std::string, InstalledFiles>> installedFiles;
+    bool rolledBack = false;
     bool verbose = false;
 };
 

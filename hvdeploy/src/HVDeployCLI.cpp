@@ -6,6 +6,7 @@
 #include <array>
 #include <cstdlib>
 #include <iostream>
+#include <limits>
 #include <utility>
 
 #include "hvdeploy/src/ArgumentLine.h"
@@ -50,6 +51,19 @@ bool IsDirectory(const fs::path& path) {
     return fs::is_directory(path, ignored);
 }
 
+/// The part of `argument` up to its first "=", which is included; empty without one.
+std::string KeyOf(const std::string& argument) {
+    const std::size_t equals = argument.find('=');
+    return argument.substr(0, equals == std::string::npos ? 0 : equals + 1);
+}
+
+/// The number that `text` begins with, within the bounds of a result; 0 when it begins with none.
+int LeadingNumber(const std::string& text) {
+    constexpr long long least = std::numeric_limits<int>::min();
+    constexpr long long most = std::numeric_limits<int>::max();
+    return static_cast<int>(std::clamp(std::strtoll(text.c_str(), nullptr, 10), least, most));
+}
+
 int Fold(EngineResult result) {
     return IsFailure(result) ? -1 : 0;
 }
@@ -71,6 +85,13 @@ int DeployCLI::ParseLine(std::string line) {
             return -1;
         case LineSplit::Done:
             break;
+    }
+    return ParseArguments(arguments);
+}
+
+int DeployCLI::ParseArguments(const std::vector<std::string>& arguments) {
+    if (arguments.empty()) {
+        return -1;
     }
     std::vector<const char*> argv{kProgramArgument};
     for (const std::string& argument : arguments) {
@@ -113,14 +134,17 @@ int DeployCLI::ParseArg(const char* arg) {
         flags.push_back(argument);
         return 0;
     }
-    const std::size_t equals = argument.find('=');
-    const std::string key = argument.substr(0, equals == std::string::npos ? 0 : equals + 1);
-    if (!Holds(kKeys, key)) {
+    if (!IsArgument(argument)) {
         HVL_LOG(Error, "unsupported argument: " << argument);
         return -1;
     }
-    args[key] = argument.substr(equals + 1);
+    const std::string key = KeyOf(argument);
+    args[key] = argument.substr(key.size());
     return 0;
+}
+
+bool IsArgument(const std::string& argument) {
+    return Holds(kFlags, argument) || Holds(kKeys, KeyOf(argument));
 }
 
 std::string DeployCLI::GetArg(const std::string& key) const {
@@ -142,12 +166,14 @@ int DeployCLI::Run() {
         try {
             result = RunCommand();
         } catch (const std::exception& error) {
+            brokenOff = true;
             if (!IsFailure(result)) {
                 result = ErrorCodeFromText(error.what());
             }
             HVL_LOG(Error, "exception caught in HV::DeployCLI::Run(): \n" << error.what());
         }
     } catch (...) {
+        brokenOff = true;
         result = -1;
         HVL_LOG(Error, "unknown exception caught in HV::DeployCLI::Run()");
     }
@@ -196,7 +222,7 @@ int ErrorCodeFromText(const std::string& text) {
     if (end == std::string::npos) {
         return -1;
     }
-    return std::atoi(text.substr(start, end - start).c_str());
+    return LeadingNumber(text.substr(start, end - start));
 }
 
 int DeployCLI::DoDeployCommand() {

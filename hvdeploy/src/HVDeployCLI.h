@@ -33,6 +33,10 @@ public:
     /// std::runtime_error when the value of "log=" is too long.
     [[nodiscard]] int ParseLine(std::string line);
 
+    /// What ParseLine() does with the pieces of its line, for arguments that are split already and stand as they are,
+    /// whatever quotes and blanks they hold. Without any it is a blank line.
+    [[nodiscard]] int ParseArguments(const std::vector<std::string>& arguments);
+
     /// Reads arguments that are split already; argument 0 is the program. Returns 0, or the code of the first argument
     /// that fails; those behind it are not looked at.
     [[nodiscard]] int ParseArgs(int argc, const char* const* argv);
@@ -68,6 +72,8 @@ public:
     const std::vector<std::string>& Flags() const { return flags; }
     bool IsVerbose() const { return verbose; }
     bool IsTestError() const { return testError; }
+    /// Whether an exception ended Run(), whose result may be 0 all the same.
+    bool WasBrokenOff() const { return brokenOff; }
 
 private:
     bool HasFlag(const char* flag) const;
@@ -86,6 +92,7 @@ private:
     std::vector<std::string> flags;
     bool verbose = false;
     bool testError = false;
+    bool brokenOff = false;
     fs::path exePath;
     fs::path initialDir;
     fs::path exeDir;
@@ -96,7 +103,11 @@ private:
     std::unique_ptr<boost::thread> thread;  // stays empty: a run's thread belongs to its job
 };
 
-/// The code that the text of an exception carries in the shape "ERROR(" number ")", or -1.
+/// Whether `argument` by itself is one of a line: a flag, or a known key with any value.
+[[nodiscard]] bool IsArgument(const std::string& argument);
+
+/// The code that the text of an exception carries in the shape "ERROR(" number ")", or -1. A number that no code can
+/// hold gives the nearest that one can.
 [[nodiscard]] int ErrorCodeFromText(const std::string& text);
 
 }  // namespace HV

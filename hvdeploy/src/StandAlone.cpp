@@ -1,10 +1,11 @@
 #include "hvdeploy/src/StandAlone.h"
 
-#include <atomic>
+#include <algorithm>
 #include <iostream>
-#include <memory>
 
+#include "hvdeploy/src/ArgumentLine.h"
 #include "hvdeploy/src/HVDeployCLI.h"
+#include "hvdeploy/src/Interrupts.h"
 #include "hvdeploy/src/ProgressBar.h"
 #include "platform/win32.h"
 
@@ -22,48 +23,47 @@ constexpr const char* kUsage =
     "  list=installed   show the products that are installed\n"
     "  --verbose --about --version --legacyuninstall --error\n";
 
-/// For a run that nobody watches: the log says it all.
-class SilentListener : public ProgressListenerInterface {
-public:
-    void update(std::uint32_t /*percent*/, const char* /*message*/, std::int32_t /*error*/) override {}
-};
+constexpr const char* kNoRun = "bad arguments; run hvdeploy without any to see its options";
 
-/// Turns an interrupt from the keyboard into a cancel of one front end, for as long as this object lives.
-class InterruptCancels {
+/// Hands reports on once it is open, beginning with the last one before: what turns out to be no installation has
+/// nothing to show. Without a target nobody watches, and the log says it all.
+class Gate : public ProgressListenerInterface {
 public:
-    explicit InterruptCancels(DeployCLI& cli) {
-        Target() = &cli;
-        SetConsoleCtrlHandler(&OnInterrupt, TRUE);
+    explicit Gate(ProgressListenerInterface* target) : target_(target) {}
+
+    void update(std::uint32_t percent, const char* message, std::int32_t error) override {
+        if (!isOpen_) {
+            percent_ = percent;
+            message_ = message != nullptr ? message : "";
+        } else if (target_ != nullptr) {
+            target_->update(percent, message, error);
+        }
     }
-    ~InterruptCancels() {
-        SetConsoleCtrlHandler(&OnInterrupt, FALSE);
-        Target() = nullptr;
+
+    void Open() {
+        isOpen_ = true;
+        update(percent_, message_.c_str(), 0);
     }
-    InterruptCancels(const InterruptCancels&) = delete;
-    InterruptCancels& operator=(const InterruptCancels&) = delete;
 
 private:
-    static std::atomic<DeployCLI*>& Target() {
-        static std::atomic<DeployCLI*> target{nullptr};
-        return target;
-    }
-    // Called on a thread of the platform's own.
-    static BOOL WINAPI OnInterrupt(DWORD event) {
-        DeployCLI* const cli = Target();
-        if (cli == nullptr || (event != CTRL_C_EVENT && event != CTRL_BREAK_EVENT)) {
-            return FALSE;
-        }
-        cli->Cancel();
-        return TRUE;
-    }
+    ProgressListenerInterface* target_;
+    bool isOpen_ = false;
+    std::uint32_t percent_ = 0;
+    std::string message_;
 };
 
-bool HasAny(const std::string& text, const char* characters) {
-    return text.find_first_of(characters) != std::string::npos;
+bool Holds(const std::string& text, char character) {
+    return text.find(character) != std::string::npos;
+}
+
+/// Whether the rules of a line leave the argument as it is: its white space lies between quotes of its own.
+bool IsOnePiece(const std::string& argument) {
+    std::vector<std::string> pieces;
+    return SplitArgumentLine(argument, pieces) == LineSplit::Done && pieces == std::vector<std::string>{argument};
 }
 
 std::string Requoted(const std::string& argument) {
-    if (!HasAny(argument, " \t\n\v\f\r") || HasAny(argument, "\"'")) {
+    if (argument.empty() || IsOnePiece(argument) || Holds(argument, '"')) {
         return argument;
     }
     const std::size_t equals = argument.find('=');
@@ -71,11 +71,63 @@ std::string Requoted(const std::string& argument) {
     return argument.substr(0, valueStart) + "\"" + argument.substr(valueStart) + "\"";
 }
 
-int RunLine(const std::string& line, ProgressListenerInterface& listener) {
-    DeployCLI cli(&listener);
-    const InterruptCancels interrupts(cli);
-    const bool done = cli.ParseLine(line) == 0 && cli.Run() == 0;
-    return done ? 0 : 1;
+// A line has no way to write two apostrophes that are none of its quotes, nor a file's name with a blank. So arguments
+// go as the process got them, unless somebody has written them in the manner of a line, with quotes for it to pair.
+int Parse(DeployCLI& cli, const std::vector<std::string>& arguments) {
+    const bool standAlone = std::all_of(arguments.begin(), arguments.end(), [](const std::string& argument) {
+        return IsArgument(argument) && !Holds(argument, '"');
+    });
+    return standAlone ? cli.ParseArguments(arguments) : cli.ParseLine(LineFromArguments(arguments));
+}
+
+const char* FailedOutcome(const DeployRollback& rollback) {
+    if (rollback.HasRolledBack()) {
+        return "failed and undone";
+    }
+    return rollback.HasInstalledFiles() ? "failed; what was installed until then stays"
+                                        : "failed; nothing was installed";
+}
+
+const char* Outcome(bool failed, const DeployRollback& rollback) {
+    if (failed) {
+        return FailedOutcome(rollback);
+    }
+    return rollback.HasInstalledFiles() ? "installed" : "nothing to do";
+}
+
+/// What the user is told in the end, besides the exit status. A list speaks for itself.
+struct Ending {
+    int exitStatus = 1;
+    const char* text = nullptr;
+};
+
+Ending RunArguments(const std::vector<std::string>& arguments, ProgressListenerInterface* watcher) {
+    Gate reports(watcher);
+    DeployCLI cli(&reports);
+    const Interrupts interrupts([&cli] { cli.Cancel(); });
+    if (Parse(cli, arguments) != 0) {
+        return {1, kNoRun};
+    }
+    const bool isList = cli.CountArg("list=");
+    if (!isList) {
+        reports.Open();
+    }
+    const int exitStatus = cli.Run() == 0 ? 0 : 1;
+    const bool failed = exitStatus != 0 || cli.WasBrokenOff();
+    return {exitStatus, isList && !failed ? nullptr : Outcome(failed, cli.Engine().Rollback())};
+}
+
+/// The bar is gone from the terminal when this comes back.
+Ending RunWatched(const std::vector<std::string>& arguments) {
+    if (_isatty(_fileno(stdout)) == 0) {
+        return RunArguments(arguments, nullptr);
+    }
+    ProgressBar bar(std::cout);
+    return RunArguments(arguments, &bar);
+}
+
+void Tell(const char* text) {
+    std::cerr << "hvdeploy: " << text << std::endl;
 }
 
 }  // namespace
@@ -94,14 +146,13 @@ int RunStandAlone(const std::vector<std::string>& arguments) {
         return 1;
     }
     try {
-        if (_isatty(_fileno(stdout)) != 0) {
-            ProgressBar bar(std::cout);
-            return RunLine(LineFromArguments(arguments), bar);
+        const Ending ending = RunWatched(arguments);
+        if (ending.text != nullptr) {
+            Tell(ending.text);
         }
-        SilentListener silent;
-        return RunLine(LineFromArguments(arguments), silent);
+        return ending.exitStatus;
     } catch (const std::exception& error) {
-        std::cerr << "hvdeploy: " << error.what() << std::endl;
+        Tell(error.what());
         return 1;
     }
 }

@@ -146,6 +146,13 @@ TEST(ErrorCodeFromText, ReadsTheNumberOfAnErrorText) {
     EXPECT_EQ(HV::ErrorCodeFromText("ERROR(12 apples)"), 12);
 }
 
+TEST(ErrorCodeFromText, IsTheNearestCodeForANumberThatNoneCanHold) {
+    EXPECT_EQ(HV::ErrorCodeFromText("ERROR(4294967296)"), 2147483647);
+    EXPECT_EQ(HV::ErrorCodeFromText("ERROR(99999999999999999999999)"), 2147483647);
+    EXPECT_EQ(HV::ErrorCodeFromText("ERROR(-4294967296)"), -2147483647 - 1);
+    EXPECT_EQ(HV::ErrorCodeFromText("ERROR(2147483647)"), 2147483647);
+}
+
 TEST(ErrorCodeFromText, IsMinusOneForAnEmptyText) {
     EXPECT_EQ(HV::ErrorCodeFromText(""), -1);
 }
@@ -162,6 +169,8 @@ TEST(ErrorCodeFromText, IsMinusOneWhenTheTextEndsBeforeTheNumber) {
 
 TEST(ErrorCodeFromText, IsMinusOneWithoutAClosingParenthesis) {
     EXPECT_EQ(HV::ErrorCodeFromText("ERROR(42"), -1);
+    // One before the number closes nothing.
+    EXPECT_EQ(HV::ErrorCodeFromText("a) ERROR(42"), -1);
 }
 
 TEST(ErrorCodeFromText, IsZeroWhereNoNumberBegins) {

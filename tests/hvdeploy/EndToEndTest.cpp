@@ -44,7 +44,7 @@ TEST_F(EndToEndTest, InstallsThreePhasesOfPackages) {
     (void)Product("after").Named("postflight-after.hvpkg").WriteTo(kFolder);
     const ProgramResult result = Deploy();
     EXPECT_EQ(result.exitStatus, 0) << result.output;
-    EXPECT_EQ(result.errors, "");
+    EXPECT_EQ(result.errors, "hvdeploy: installed\n");
     EXPECT_EQ(Files(), (Contents{{kHome + "before.txt", "text of before"},
                                  {kHome + "glow.txt", "text of glow"},
                                  {kHome + "flare.txt", "text of flare"},
@@ -132,12 +132,13 @@ TEST_F(EndToEndTest, LeavesOutWhatItIsToldToSkip) {
 TEST_F(EndToEndTest, InstallsOnePackage) {
     (void)Product("glow").Named("my glow.hvpkg").WriteTo(kFolder);
     (void)Product("flare").WriteTo(kFolder);
-    // The program quotes a blank for the line, and the name of a file is taken with its quotes.
-    const ProgramResult quoted = RunProgram("hvdeploy", {R"(file=C:\Packages\my glow.hvpkg)"});
+    // The name of a file is taken with its quotes.
+    const ProgramResult quoted = RunProgram("hvdeploy", {R"(file="C:\Packages\com.halvorn.flare.hvpkg")"});
     EXPECT_EQ(quoted.exitStatus, 1);
-    const ProgramResult plain = RunProgram("hvdeploy", {R"(file=C:\Packages\com.halvorn.flare.hvpkg)"});
+    EXPECT_EQ(Files(), Contents{});
+    const ProgramResult plain = RunProgram("hvdeploy", {R"(file=C:\Packages\my glow.hvpkg)"});
     EXPECT_EQ(plain.exitStatus, 0);
-    EXPECT_EQ(Files(), (Contents{{kHome + "flare.txt", "text of flare"}}));
+    EXPECT_EQ(Files(), (Contents{{kHome + "glow.txt", "text of glow"}}));
 }
 
 TEST_F(EndToEndTest, InstallsTheSameAgain) {

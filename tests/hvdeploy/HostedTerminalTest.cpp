@@ -92,6 +92,8 @@ private:
 
 class TerminalTest : public testing::Test {
 protected:
+    using Lines = std::vector<std::string>;
+
     static PackageBuilder Glow() {
         return PackageBuilder("com.halvorn.glow")
             .Payload("resource")
@@ -109,15 +111,17 @@ TEST_F(TerminalTest, ShowsTheBarToTheEndOfTheRun) {
     EXPECT_EQ(output.rfind("[........................]   1% Preparing to install...", 0), 0U) << output;
     EXPECT_NE(output.find("Installing com.halvorn.glow.hvpkg..."), std::string::npos) << output;
     EXPECT_EQ(TerminalPicture(output),
-              (std::vector<std::string>{"[########################] 100% Installation complete."}));
+              (Lines{"[########################] 100% Installation complete.", "hvdeploy: installed"}));
 }
 
 TEST_F(TerminalTest, KeepsTheBarBelowTheLog) {
     (void)Glow().WriteTo(R"(C:\Packages)");
     Terminal terminal({R"(dir=C:\Packages)"});
     EXPECT_EQ(terminal.Wait(), 0);
-    const std::vector<std::string> lines = TerminalPicture(terminal.Output());
+    Lines lines = TerminalPicture(terminal.Output());
     ASSERT_GT(lines.size(), 20U);
+    EXPECT_EQ(lines.back(), "hvdeploy: installed");
+    lines.pop_back();
     for (std::size_t i = 0; i + 1 < lines.size(); ++i) {
         EXPECT_NE(lines[i].rfind('[', 0), 0U) << "a bar was left behind: " << lines[i];
     }
@@ -129,14 +133,21 @@ TEST_F(TerminalTest, LeavesTheBarWhereAFailedRunCameToAHalt) {
     Terminal terminal({R"(dir=C:\Nothing)", "loglevel=emerg"});
     EXPECT_EQ(terminal.Wait(), 1);
     EXPECT_EQ(TerminalPicture(terminal.Output()),
-              (std::vector<std::string>{"[........................]   1% An error occurred during installation."}));
+              (Lines{"[........................]   1% An error occurred during installation.",
+                     "hvdeploy: failed; nothing was installed"}));
 }
 
-TEST_F(TerminalTest, PrintsAListAboveTheBar) {
+TEST_F(TerminalTest, PrintsAListWithoutABar) {
     Terminal terminal({"list=hosts", "loglevel=emerg"});
     EXPECT_EQ(terminal.Wait(), 0);
+    EXPECT_EQ(TerminalPicture(terminal.Output()), Lines{"[]"});
+}
+
+TEST_F(TerminalTest, ShowsNoBarForABadArgument) {
+    Terminal terminal({"--help", "loglevel=emerg"});
+    EXPECT_EQ(terminal.Wait(), 1);
     EXPECT_EQ(TerminalPicture(terminal.Output()),
-              (std::vector<std::string>{"[]", "[........................]   1% Preparing to install..."}));
+              Lines{"hvdeploy: bad arguments; run hvdeploy without any to see its options"});
 }
 
 /// A run that stands in a script, which does not hear of the interrupt and ends when the test lets it.
@@ -175,8 +186,10 @@ protected:
         EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn\Glow.txt)"), "old");
         EXPECT_FALSE(machine.Exists(R"(C:\ProgramData\Halvorn\Second.txt)"));
         EXPECT_TRUE(machine.TempEntries().empty());
-        EXPECT_NE(TerminalPicture(terminal.Output()).back().find("100% An error occurred during installation."),
-                  std::string::npos);
+        const Lines lines = TerminalPicture(terminal.Output());
+        ASSERT_GE(lines.size(), 2U);
+        EXPECT_NE(lines[lines.size() - 2].find("100% An error occurred during installation."), std::string::npos);
+        EXPECT_EQ(lines.back(), "hvdeploy: failed and undone");
     }
 };
 

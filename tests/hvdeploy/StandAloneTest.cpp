@@ -41,13 +41,26 @@ TEST(LineFromArguments, QuotesAnArgumentWithoutAnEqualsSignAsAWhole) {
     EXPECT_EQ(LineFromArguments({"a b"}), "\"a b\"");
 }
 
-TEST(LineFromArguments, LeavesAnArgumentAloneThatHoldsAQuoteAlready) {
-    EXPECT_EQ(LineFromArguments({"dir=\"a b\"", "skip='a b'", "skip=it's here"}),
-              "dir=\"a b\" skip='a b' skip=it's here");
+TEST(LineFromArguments, LeavesAnArgumentAloneThatIsQuotedAlready) {
+    EXPECT_EQ(LineFromArguments({"dir=\"a b\"", "skip='a b'", "skip='a", "b'"}), "dir=\"a b\" skip='a b' skip='a b'");
+}
+
+TEST(LineFromArguments, QuotesABlankBesideAnApostrophe) {
+    EXPECT_EQ(LineFromArguments({R"(dir=C:\Bob's Packs)"}), R"(dir="C:\Bob's Packs")");
+    EXPECT_EQ(LineFromArguments({R"(dir=C:\Bob's and Al's Packs)"}), R"(dir="C:\Bob's and Al's Packs")");
 }
 
 TEST(LineFromArguments, KeepsAnEmptyArgumentAsABlank) {
     EXPECT_EQ(LineFromArguments({"--about", "", "--verbose"}), "--about  --verbose");
+}
+
+constexpr const char* kBadArguments = "hvdeploy: bad arguments; run hvdeploy without any to see its options\n";
+
+PackageBuilder Product(const std::string& name) {
+    return PackageBuilder("com.halvorn." + name)
+        .Payload("resource")
+        .To("programdata", "Halvorn")
+        .File(name + ".txt", "text of " + name);
 }
 
 PackageBuilder Glow() {
@@ -75,14 +88,15 @@ TEST(StandAlone, FailsForABlankLine) {
     const Machine machine;
     const ProgramResult result = RunProgram("hvdeploy", {""});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(result.output + result.errors, "");
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, kBadArguments);
 }
 
 TEST(StandAlone, FailsForUnbalancedQuotes) {
     const Machine machine;
     const ProgramResult result = RunProgram("hvdeploy", {"dir=\"a"});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(result.errors, "Line parsing error: unbalanced double quotes.\n");
+    EXPECT_EQ(result.errors, std::string("Line parsing error: unbalanced double quotes.\n") + kBadArguments);
 }
 
 TEST(StandAlone, FailsForABadArgument) {
@@ -92,9 +106,24 @@ TEST(StandAlone, FailsForABadArgument) {
     EXPECT_NE(result.output.find(" ERROR hvdeploy-detail : unsupported argument: help=\n"), std::string::npos);
 }
 
+TEST(StandAlone, TellsWhereItsOptionsAreForEveryBadArgument) {
+    const Machine machine;
+    int told = 0;
+    for (const char* word : {"--help", "/?", "--verbos", "dri=C:\\Packages", "list", "C:\\My Packages"}) {
+        const ProgramResult result = RunProgram("hvdeploy", {word, "loglevel=emerg"});
+        EXPECT_EQ(result.exitStatus, 1) << word;
+        EXPECT_EQ(result.output, "") << word;
+        EXPECT_EQ(result.errors, kBadArguments) << word;
+        ++told;
+    }
+    EXPECT_EQ(told, 6);
+}
+
 TEST(StandAlone, FailsForARunThatFails) {
     const Machine machine;
-    EXPECT_EQ(RunProgram("hvdeploy", {R"(dir=C:\Nothing)"}).exitStatus, 1);
+    const ProgramResult result = RunProgram("hvdeploy", {R"(dir=C:\Nothing)"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors, "hvdeploy: failed; nothing was installed\n");
 }
 
 TEST(StandAlone, InstallsFromAFolderWithABlankInItsName) {
@@ -103,6 +132,80 @@ TEST(StandAlone, InstallsFromAFolderWithABlankInItsName) {
     const ProgramResult result = RunProgram("hvdeploy", {R"(dir=C:\My Packages)"});
     EXPECT_EQ(result.exitStatus, 0) << result.output;
     EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn\Glow.txt)"), "new");
+}
+
+TEST(StandAlone, TakesApostrophesAndBlanksAsTheyStandInEveryValue) {
+    const Machine machine;
+    const std::string folder = R"(C:\Bob's Packs)";
+    (void)Glow().WriteTo(folder);
+    (void)Product("flare").Named("Al's flare.hvpkg").WriteTo(folder);
+    const ProgramResult result =
+        RunProgram("hvdeploy", {"dir=" + folder, R"(log=C:\Cy's Logs\Dee's run.log)", "skip=Al's flare.hvpkg"});
+    EXPECT_EQ(result.exitStatus, 0) << result.output;
+    EXPECT_EQ(machine.Content(R"(C:\ProgramData\Halvorn\Glow.txt)"), "new");
+    EXPECT_FALSE(machine.Exists(R"(C:\ProgramData\Halvorn\flare.txt)"));
+    EXPECT_NE(machine.Content(R"(C:\Cy's Logs\Dee's run.log)").find("Installation complete."), std::string::npos);
+    EXPECT_EQ(RunProgram("hvdeploy", {"file=" + folder + R"(\Al's flare.hvpkg)"}).exitStatus, 0);
+    EXPECT_TRUE(machine.Exists(R"(C:\ProgramData\Halvorn\flare.txt)"));
+}
+
+TEST(StandAlone, PairsQuotesThatWereTypedAcrossArguments) {
+    const Machine machine;
+    (void)Glow().Named("my glow.hvpkg").WriteTo(R"(C:\Packages)");
+    const ProgramResult result = RunProgram("hvdeploy", {R"(dir=C:\Packages)", "skip='my", "glow.hvpkg'"});
+    EXPECT_EQ(result.exitStatus, 0) << result.output;
+    EXPECT_FALSE(machine.Exists(R"(C:\ProgramData\Halvorn\Glow.txt)"));
+}
+
+/// The last word of a run on a fresh machine with these packages.
+class OutcomeTest : public testing::Test {
+protected:
+    ProgramResult Deploy() { return RunProgram("hvdeploy", {R"(dir=C:\Packages)", "loglevel=emerg"}); }
+    static void Ships(const PackageBuilder& package) { (void)package.WriteTo(R"(C:\Packages)"); }
+    static PackageBuilder Failing() { return Product("zfailing").Payload("resource").File("x", "x").To("nowhere"); }
+
+    Machine machine;
+};
+
+TEST_F(OutcomeTest, IsThatItIsInstalled) {
+    Ships(Glow());
+    EXPECT_EQ(Deploy().errors, "hvdeploy: installed\n");
+}
+
+TEST_F(OutcomeTest, IsThatItIsInstalledThoughTheLastPackageHadNothingToDo) {
+    Ships(Glow());
+    Ships(PackageBuilder("com.halvorn.last").Named("postflight-last.hvpkg"));
+    EXPECT_EQ(Deploy().errors, "hvdeploy: installed\n");
+}
+
+TEST_F(OutcomeTest, IsThatThereWasNothingToDo) {
+    machine.HasFolder(R"(C:\Packages)");
+    EXPECT_EQ(Deploy().errors, "hvdeploy: nothing to do\n");
+}
+
+TEST_F(OutcomeTest, IsThatTheRunFailedAndIsUndone) {
+    Ships(Glow().Named("preflight-glow.hvpkg"));
+    Ships(Failing());
+    const ProgramResult result = Deploy();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors, "hvdeploy: failed and undone\n");
+    EXPECT_FALSE(machine.Exists(R"(C:\ProgramData\Halvorn\Glow.txt)"));
+}
+
+TEST_F(OutcomeTest, IsThatWhatWasInstalledStaysWhereAFailureIsNotUndone) {
+    Ships(Glow().DependsOn("com.halvorn.nobody"));
+    const ProgramResult result = Deploy();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors, "hvdeploy: failed; what was installed until then stays\n");
+    EXPECT_TRUE(machine.Exists(R"(C:\ProgramData\Halvorn\Glow.txt)"));
+}
+
+TEST_F(OutcomeTest, IsAFailureWhateverTheExitStatusSays) {
+    machine.Has(R"(C:\Packages\suite.json)", "[1, 2]");
+    Ships(Glow());
+    const ProgramResult result = Deploy();
+    EXPECT_EQ(result.exitStatus, 0) << "the number in the exception's text";
+    EXPECT_EQ(result.errors, "hvdeploy: failed; nothing was installed\n");
 }
 
 /// Makes a folder of the machine the current one, which programs inherit, for as long as this object lives.
@@ -138,7 +241,7 @@ TEST(StandAlone, StartedFromAnotherFolderDoesNotSeeThePackagesBesideTheProgram) 
     const WorkingIn elsewhere(R"(C:\Elsewhere)");
     const ProgramResult result = RunProgram("hvdeploy", {"loglevel=info"});
     EXPECT_EQ(result.exitStatus, 0);
-    EXPECT_EQ(result.errors, "");
+    EXPECT_EQ(result.errors, "hvdeploy: nothing to do\n");
     EXPECT_NE(result.output.find(" INFO hvdeploy-detail : No files to install.\n"), std::string::npos) << result.output;
     EXPECT_EQ(machine.Files(), before);
 }
@@ -148,7 +251,7 @@ TEST(StandAlone, ShowsNoBarWhereNobodyWatches) {
     (void)Glow().WriteTo(R"(C:\Packages)");
     const ProgramResult result = RunProgram("hvdeploy", {R"(dir=C:\Packages)", "loglevel=emerg"});
     EXPECT_EQ(result.exitStatus, 0);
-    EXPECT_EQ(result.output + result.errors, "");
+    EXPECT_EQ(result.output, "");
 }
 
 TEST(StandAlone, SaysSoWhenItCannotMakeItsStash) {
