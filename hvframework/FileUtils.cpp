@@ -11,8 +11,8 @@
 
 #include "hvframework/Md5.h"
 #include "hvframework/StringUtils.h"
+#include "platform/files.h"
 #include "platform/filesystem.h"
-#include "platform/win32.h"
 
 namespace HVL::FileUtils {
 namespace {
@@ -32,8 +32,7 @@ struct FileCloser {
 using File = std::unique_ptr<std::FILE, FileCloser>;
 
 File OpenForReading(const std::string& path) {
-    std::FILE* file = nullptr;
-    return File(fopen_s(&file, path.c_str(), "rb") == 0 ? file : nullptr);
+    return File(platform::OpenStream(path, "rb"));
 }
 
 fs::file_status StatusOf(const std::string& path) {
@@ -222,7 +221,7 @@ int CreateDirectories(const std::string& path) {
             return result;
         }
     }
-    const int result = _mkdir(path.c_str());
+    const int result = platform::MakeDirectory(path);
     return result != 0 && Exists(path) ? 0 : result;
 }
 
@@ -239,7 +238,7 @@ int DeleteDirectory(const std::string& path) {
             return result;
         }
     }
-    return !error && RemoveDirectoryA(path.c_str()) ? 0 : -1;
+    return !error && platform::RemoveEmptyDirectory(path) ? 0 : -1;
 }
 
 // A link or a junction is removed as what it is. Someone may have moved a plug-in folder to another disk and left a
@@ -248,12 +247,12 @@ int DeleteEntry(const std::string& path, const fs::file_status& status) {
     if (fs::is_directory(status)) {
         return DeleteDirectory(path);
     }
-    const int result = _unlink(path.c_str());
+    const int result = platform::RemoveFile(path);
     if (result == 0 || fs::is_regular_file(status)) {
         return result;
     }
     // A link onto a directory is itself one to Windows, and goes only this way.
-    return RemoveDirectoryA(path.c_str()) ? 0 : result;
+    return platform::RemoveEmptyDirectory(path) ? 0 : result;
 }
 
 }  // namespace
@@ -303,7 +302,7 @@ int CopyFileOrDirectory(const std::string& source, const std::string& destinatio
         fs::copy_file(fs::path(source), fs::path(destination));
         return 0;
     }
-    if (!DirectoryExists(destination) && _mkdir(destination.c_str()) != 0) {
+    if (!DirectoryExists(destination) && platform::MakeDirectory(destination) != 0) {
         return -1;
     }
     return CopyTree(source, destination);

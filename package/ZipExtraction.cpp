@@ -9,7 +9,7 @@
 #include "hvframework/Log.h"
 #include "hvframework/StringUtils.h"
 #include "package/ZipEntries.h"
-#include "platform/win32.h"
+#include "platform/files.h"
 
 namespace HV {
 namespace {
@@ -50,8 +50,8 @@ bool WriteCurrentEntry(ZipEntries& archive, EntryBuffer& buffer, std::FILE* file
 }
 
 bool ExtractCurrentEntry(ZipEntries& archive, EntryBuffer& buffer, const std::string& target) {
-    std::FILE* file = nullptr;
-    if (fopen_s(&file, target.c_str(), "wb") != 0 || file == nullptr) {
+    std::FILE* const file = platform::OpenStream(target, "wb");
+    if (file == nullptr) {
         return false;
     }
     const bool written = WriteCurrentEntry(archive, buffer, file);

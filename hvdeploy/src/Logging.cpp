@@ -22,6 +22,7 @@
 #include "hvdeploy/src/HVDeployCLI.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
+#include "platform/files.h"
 #include "platform/filesystem.h"
 #include "platform/libraries.h"
 #include "platform/win32.h"
@@ -156,8 +157,8 @@ int WriteLoggingConfig(const std::string& configPath, const std::string& logFile
     const std::string folder = logDir.empty() ? DefaultLogFolder() : logDir;
     // ConfigureLogging reports the file that cannot be opened where the folder cannot be made.
     (void)FileUtils::CreateDirectories(folder);
-    std::FILE* file = nullptr;
-    if (fopen_s(&file, configPath.c_str(), "w") != 0 || file == nullptr) {
+    std::FILE* const file = platform::OpenStream(configPath, "w");
+    if (file == nullptr) {
         return 0;
     }
     const std::string text = PropertyText(folder + "\\" + logFileName);

@@ -9,6 +9,7 @@
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
 #include "hvframework/Version.h"
+#include "platform/files.h"
 #include "platform/filesystem.h"
 #include "platform/win32.h"
 #include "system/RegistryKey.h"
@@ -193,8 +194,8 @@ bool UninstallScripts::ReadExistingLines(const std::string& scriptPath) {
 }
 
 void UninstallScripts::Append(const std::string& scriptPath, const std::string& text) {
-    std::FILE* file = nullptr;
-    if (fopen_s(&file, scriptPath.c_str(), "a") != 0 || file == nullptr) {
+    std::FILE* const file = platform::OpenStream(scriptPath, "a");
+    if (file == nullptr) {
         return;
     }
     const bool isWritten = std::fwrite(text.data(), 1, text.size(), file) == text.size();

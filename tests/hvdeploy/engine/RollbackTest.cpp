@@ -216,6 +216,31 @@ TEST_F(EngineRollbackTest, LeavesTheFirstPayloadsFileWhereTwoPlacedOnePath) {
     EXPECT_EQ(log.Count(DebugLine(R"(Restoring original file at "C:\ProgramData\Halvorn\glow.dll")")), 2U);
 }
 
+// Longer than Windows takes where long paths are switched off. Wine takes any length by wide names, and no more than
+// 259 characters by narrow ones, so it shows whether both halves of the engine go the same way.
+TEST_F(EngineRollbackTest, UndoesWhatLiesBeyond260Characters) {
+    const std::string deep = "Halvorn\\" + std::string(100, 'a') + "\\" + std::string(60, 'b');
+    const std::string inside = std::string(80, 'c') + "/" + std::string(20, 'd');
+    const std::string bundle = InProgramData(deep) + R"(\Glow)";
+    const std::string placed = bundle + "\\" + inside + R"(\new.txt)";
+    ASSERT_GT(placed.size(), 290U);
+    machine.Has(bundle + R"(\old.txt)", "old");
+    const auto before = machine.FilesWithoutFolders();
+    const PackageBuilder package = PackageBuilder("com.halvorn.glow")
+                                       .Payload("resource")
+                                       .To("programdata", deep)
+                                       .Source("Glow")
+                                       .File("Glow/" + inside + "/new.txt", "new");
+    EXPECT_EQ(Install({package}), HV::kPlaced) << log.Text();
+    EXPECT_TRUE(fs::is_regular_file(fs::path(placed)));
+    EXPECT_EQ(Install({Failing("grain")}), -2);
+    EXPECT_FALSE(fs::exists(fs::path(bundle + "\\" + inside).parent_path()));
+    auto after = machine.FilesWithoutFolders();
+    std::erase_if(after, [](const auto& item) { return item.first.rfind(kPackages, 0) == 0; });
+    EXPECT_EQ(after, before);
+    EXPECT_EQ(log.LinesStartingWith("WARN"), std::vector<std::string>{});
+}
+
 TEST_F(EngineRollbackTest, UndoesPackagesOfEarlierPhases) {
     machine.Has(Placed("runtime"), "old");
     Ships(Placing("runtime").Named("preflight-runtime.hvpkg"));
