@@ -8,26 +8,34 @@ function(hv_room name)
     target_link_libraries(hv_${name} PUBLIC ${ARG_LINKS} PRIVATE hv_flags)
 endfunction()
 
-# hv_program(NAME [ADMINISTRATOR] SOURCES file... LINKS target...): the program NAME in the preset's bin folder.
-# ADMINISTRATOR: Windows asks for elevation when it starts.
+# hv_program(NAME [ADMINISTRATOR] [OLD_CODE_PAGE] SOURCES file... LINKS target...): the program NAME in the preset's bin
+# folder. ADMINISTRATOR: Windows asks for elevation when it starts. OLD_CODE_PAGE: it has the system's code page, as every
+# program has on Windows before version 1903.
 function(hv_program name)
-    cmake_parse_arguments(ARG "ADMINISTRATOR" "" "SOURCES;LINKS" ${ARGN})
+    cmake_parse_arguments(ARG "ADMINISTRATOR;OLD_CODE_PAGE" "" "SOURCES;LINKS" ${ARGN})
     hv_refuse_leftovers(hv_program ${name} "${ARG_UNPARSED_ARGUMENTS}")
     add_executable(${name} ${ARG_SOURCES})
     target_link_libraries(${name} PRIVATE ${ARG_LINKS} hv_flags)
+    set(code_page "<activeCodePage xmlns=\"http://schemas.microsoft.com/SMI/2019/WindowsSettings\">UTF-8</activeCodePage>")
     if(ARG_ADMINISTRATOR)
-        hv_complete_windows_program(${name} requireAdministrator)
+        hv_complete_windows_program(${name} requireAdministrator "${code_page}")
+    elseif(ARG_OLD_CODE_PAGE)
+        hv_complete_windows_program(${name} asInvoker "")
     else()
-        hv_complete_windows_program(${name} asInvoker)
+        hv_complete_windows_program(${name} asInvoker "${code_page}")
     endif()
 endfunction()
 
-# hv_test(NAME SOURCES file... LINKS target...): a GoogleTest program that ctest runs, on every target. There is no
-# other list of tests.
+# hv_test(NAME [OLD_CODE_PAGE] SOURCES file... LINKS target...): a GoogleTest program that ctest runs, on every target.
+# There is no other list of tests.
 function(hv_test name)
-    cmake_parse_arguments(ARG "" "" "SOURCES;LINKS" ${ARGN})
+    cmake_parse_arguments(ARG "OLD_CODE_PAGE" "" "SOURCES;LINKS" ${ARGN})
     hv_refuse_leftovers(hv_test ${name} "${ARG_UNPARSED_ARGUMENTS}")
-    hv_program(${name} SOURCES ${ARG_SOURCES} LINKS ${ARG_LINKS} hv_test_support third::gtest_main)
+    set(code_page)
+    if(ARG_OLD_CODE_PAGE)
+        set(code_page OLD_CODE_PAGE)
+    endif()
+    hv_program(${name} ${code_page} SOURCES ${ARG_SOURCES} LINKS ${ARG_LINKS} hv_test_support third::gtest_main)
     add_test(NAME ${name} COMMAND ${name})
     set_property(GLOBAL APPEND PROPERTY HV_TEST_PROGRAMS ${name})
     # A test names its machine. Where it does not, it must fail rather than use the machine in the user's home.

@@ -6,11 +6,12 @@ namespace fs = boost::filesystem;
 
 namespace platform {
 
-/// Makes the library read and write narrow paths as UTF-8. By itself it asks Windows for the process's code page, which
-/// is UTF-8 only where the manifest is heeded, and does so with flags that Windows documents as an error for UTF-8.
-bool UseUtf8InPaths();
+/// Makes the library read and write narrow paths in the process's code page, as everything else here does that takes
+/// narrow names. That is UTF-8 where the manifest is heeded. By itself the library asks Windows for the same code page,
+/// but with flags that Windows documents as an error for UTF-8.
+bool DecodePathsAsTheProcessDoes();
 
 /// Whoever sees `fs` has had this done, before any path of its own is made. It happens once a process.
-inline const bool pathsAreUtf8 = UseUtf8InPaths();
+inline const bool pathsAreDecoded = DecodePathsAsTheProcessDoes();
 
 }  // namespace platform
