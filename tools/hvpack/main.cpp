@@ -1,7 +1,8 @@
 #include <iostream>
 
+#include "platform/arguments.h"
 #include "tools/hvpack/Commands.h"
 
 int main(int argc, char** argv) {
-    return HVPack::RunCommand(std::vector<std::string>(argv + 1, argv + argc), std::cout, std::cerr);
+    return HVPack::RunCommand(platform::ProgramArguments(argc, argv), std::cout, std::cerr);
 }
