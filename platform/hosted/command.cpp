@@ -16,6 +16,7 @@
 #include <utility>
 #include <vector>
 
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/machine.h"
 
 namespace {
@@ -28,25 +29,7 @@ constexpr int CodeDescriptor = 9;
 constexpr const char* RunLine = "trap 'echo $? >&9' EXIT; eval \"$1\"";
 constexpr const char* RunFile = "trap 'echo $? >&9' EXIT; . \"$0\"";
 
-class Descriptor {
-public:
-    explicit Descriptor(int number = -1) : number_(number) {}
-    Descriptor(Descriptor&& other) noexcept : number_(std::exchange(other.number_, -1)) {}
-    Descriptor& operator=(Descriptor&& other) noexcept {
-        std::swap(number_, other.number_);
-        return *this;
-    }
-    ~Descriptor() {
-        if (number_ >= 0) {
-            close(number_);
-        }
-    }
-    [[nodiscard]] int Number() const { return number_; }
-    int Give() { return std::exchange(number_, -1); }
-
-private:
-    int number_;
-};
+using hosted::Descriptor;
 
 struct Child {
     pid_t process = -1;
@@ -165,15 +148,15 @@ FILE* _popen(const char* line, const char* mode) {
     Descriptor input(ends[0]);
     const Descriptor output(ends[1]);
     Descriptor code(memfd_create("exit code", MFD_CLOEXEC));
-    if (code.Number() < 0) {
+    if (!code.IsOpen()) {
         return nullptr;
     }
-    std::FILE* const stream = fdopen(input.Number(), "r");
+    std::FILE* const stream = fdopen(input.Get(), "r");
     if (stream == nullptr) {
         return nullptr;
     }
-    input.Give();
-    const pid_t process = Spawn(line, output.Number(), code.Number());
+    static_cast<void>(input.Give());
+    const pid_t process = Spawn(line, output.Get(), code.Get());
     if (process < 0) {
         std::fclose(stream);
         return nullptr;
@@ -192,5 +175,5 @@ int _pclose(FILE* stream) {
     std::fclose(stream);
     const int status = Wait(child.process);
     int code = 0;
-    return status != EndedFromOutside && ReadCode(child.code.Number(), code) ? code : status;
+    return status != EndedFromOutside && ReadCode(child.code.Get(), code) ? code : status;
 }

@@ -1,12 +1,16 @@
+#include <dirent.h>
 #include <fcntl.h>
 #include <sys/stat.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <memory>
 #include <string_view>
 #include <vector>
 
 #include "platform/hosted/file_error.h"
 #include "platform/hosted/folder.h"
+#include "platform/hosted/ignoring_case.h"
 #include "platform/hosted/machine.h"
 #include "platform/utf8.h"
 
@@ -14,7 +18,6 @@ namespace hosted::filesystem {
 namespace {
 
 constexpr const char* Opening = "boost::filesystem::directory_iterator::construct";
-constexpr const char* Advancing = "boost::filesystem::directory_iterator::operator++";
 
 file_type TypeOfMode(mode_t mode) {
     if (S_ISREG(mode)) {
@@ -26,36 +29,41 @@ file_type TypeOfMode(mode_t mode) {
     return S_ISLNK(mode) ? symlink_file : type_unknown;
 }
 
-}  // namespace
-
-Folder::Folder(const std::string& hostName)
-    : stream_(::opendir(hostName.c_str())), error_(stream_ == nullptr ? errno : 0) {}
-
-Folder::~Folder() {
-    if (stream_ != nullptr) {
-        ::closedir(stream_);
-    }
-}
-
-bool Folder::Next() {
-    if (stream_ == nullptr) {
-        return false;
-    }
-    do {
-        errno = 0;
-        entry_ = ::readdir(stream_);
-        error_ = entry_ == nullptr ? errno : 0;
-    } while (entry_ != nullptr && (std::string_view(Name()) == "." || std::string_view(Name()) == ".."));
-    return entry_ != nullptr;
-}
-
-file_type Folder::Type() const {
-    if (entry_->d_type != DT_UNKNOWN) {
-        return TypeOfMode(static_cast<mode_t>(DTTOIF(entry_->d_type)));
+file_type TypeOf(DIR* folder, const dirent& entry) {
+    if (entry.d_type != DT_UNKNOWN) {
+        return TypeOfMode(static_cast<mode_t>(DTTOIF(entry.d_type)));
     }
     struct stat found {};
-    const bool answered = ::fstatat(::dirfd(stream_), Name(), &found, AT_SYMLINK_NOFOLLOW) == 0;
+    const bool answered = ::fstatat(::dirfd(folder), entry.d_name, &found, AT_SYMLINK_NOFOLLOW) == 0;
     return answered ? TypeOfMode(found.st_mode) : file_not_found;
+}
+
+/// Names that differ in nothing but case, which the host allows, need an order too.
+bool ComesBefore(const Folder::Entry& left, const Folder::Entry& right) {
+    const LessIgnoringCase less;
+    return less(left.name, right.name) || (!less(right.name, left.name) && left.name < right.name);
+}
+
+}  // namespace
+
+Folder::Folder(const std::string& hostName) {
+    struct Close {
+        void operator()(DIR* folder) const { ::closedir(folder); }
+    };
+    const std::unique_ptr<DIR, Close> folder(::opendir(hostName.c_str()));
+    errno = folder != nullptr ? 0 : errno;
+    while (const dirent* entry = folder != nullptr ? ::readdir(folder.get()) : nullptr) {
+        const std::string_view name(entry->d_name);
+        if (name != "." && name != "..") {
+            entries_.push_back({std::string(name), TypeOf(folder.get(), *entry)});
+        }
+        errno = 0;
+    }
+    error_ = errno;
+    if (error_ != 0) {
+        entries_.clear();
+    }
+    std::sort(entries_.begin(), entries_.end(), ComesBefore);
 }
 
 file_status directory_entry::symlink_status() const {
@@ -92,26 +100,26 @@ class directory_iterator::Reader {
 public:
     explicit Reader(const path& folder) : path_(folder), folder_(Machine::Current().HostPath(folder.native())) {}
 
-    [[nodiscard]] const path& Path() const { return path_; }
     [[nodiscard]] const directory_entry& Entry() const { return entry_; }
     [[nodiscard]] int Error() const { return folder_.Error(); }
-    [[nodiscard]] bool AtEnd() const { return atEnd_; }
+    [[nodiscard]] bool AtEnd() const { return next_ > folder_.Entries().size(); }
 
     void Next() {
-        atEnd_ = !folder_.Next();
-        if (!atEnd_) {
-            const file_status itself(folder_.Type());
+        if (next_ < folder_.Entries().size()) {
+            const Folder::Entry& found = folder_.Entries()[next_];
+            const file_status itself(found.type);
             // What a link leads to is asked for when somebody wants to know.
-            entry_ = directory_entry(path_ / platform::WideFromUtf8(folder_.Name()),
+            entry_ = directory_entry(path_ / platform::WideFromUtf8(found.name),
                                      is_symlink(itself) ? file_status() : itself, itself);
         }
+        ++next_;
     }
 
 private:
     path path_;
     Folder folder_;
     directory_entry entry_;
-    bool atEnd_ = false;
+    std::size_t next_ = 0;
 };
 
 directory_iterator::directory_iterator(const path& folder) {
@@ -134,23 +142,18 @@ void directory_iterator::Open(const path& folder, error_code* error) {
     }
 }
 
-void directory_iterator::Advance(error_code* error) {
-    reader_->Next();
-    Report(reader_->Error(), error, Advancing, reader_->Path());
-}
-
 directory_iterator::reference directory_iterator::operator*() const {
     return reader_->Entry();
 }
 
 directory_iterator& directory_iterator::operator++() {
-    Advance(nullptr);
+    reader_->Next();
     return *this;
 }
 
 directory_iterator& directory_iterator::increment(error_code& error) {
-    Advance(&error);
-    return *this;
+    error.clear();
+    return ++*this;
 }
 
 /// From the first folder down to the one that is being read.

@@ -15,7 +15,7 @@ std::vector<std::pair<std::string, std::string>> ProcessVariables(std::string_vi
     for (char** entry = environ; entry != nullptr && *entry != nullptr; ++entry) {
         const std::string_view text(*entry);
         const std::size_t equals = text.find('=');
-        if (equals == name.size() && EqualsIgnoringCase(text.substr(0, equals), name)) {
+        if (equals != std::string_view::npos && EqualsIgnoringCase(text.substr(0, equals), name)) {
             found.emplace_back(text.substr(0, equals), text.substr(equals + 1));
         }
     }

@@ -185,7 +185,8 @@ inline bool is_symlink(const directory_entry& entry, error_code& error) {
     return is_symlink(entry.symlink_status(error));
 }
 
-/// The entries of one folder, once, in the order in which the host gives them. Copies walk together.
+/// The entries of one folder, once, in the order of their names in upper case, as they are when the folder is opened.
+/// Copies walk together.
 class directory_iterator {
 public:
     using iterator_category = std::input_iterator_tag;
@@ -213,7 +214,6 @@ public:
 private:
     class Reader;
     void Open(const path& folder, error_code* error);
-    void Advance(error_code* error);
     [[nodiscard]] bool AtEnd() const;
 
     std::shared_ptr<Reader> reader_;

@@ -1,34 +1,31 @@
 #pragma once
 
-#include <dirent.h>
-
 #include <string>
+#include <vector>
 
 #include "platform/hosted/filesystem.h"
 
 namespace hosted::filesystem {
 
-/// Reads a folder of the host, entry by entry; `.` and `..` are left out. The host's own listing says what an entry is,
-/// so nothing is asked for each; only where it does not say, Type() asks.
+/// What a folder of the host holds, read once, `.` and `..` left out, in the order in which Windows lists it: that of
+/// the names in upper case. The host's own listing says what an entry is, so nothing is asked for each but where it
+/// does not.
 class Folder {
 public:
-    explicit Folder(const std::string& hostName);
-    ~Folder();
-    Folder(const Folder&) = delete;
-    Folder& operator=(const Folder&) = delete;
+    struct Entry {
+        std::string name;
+        file_type type = status_error;  ///< What the entry itself is, a link being a link.
+    };
 
-    /// False at the end and on a failure.
-    bool Next();
-    /// 0, or the errno of the opening or of the last Next().
+    explicit Folder(const std::string& hostName);
+
+    /// 0, or the errno of the reading; there are no entries then.
     [[nodiscard]] int Error() const { return error_; }
-    [[nodiscard]] const char* Name() const { return entry_->d_name; }
-    /// What the entry itself is, a link being a link.
-    [[nodiscard]] file_type Type() const;
+    [[nodiscard]] const std::vector<Entry>& Entries() const { return entries_; }
 
 private:
-    DIR* stream_;
-    const dirent* entry_ = nullptr;
-    int error_;
+    std::vector<Entry> entries_;
+    int error_ = 0;
 };
 
 }  // namespace hosted::filesystem

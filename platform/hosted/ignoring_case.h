@@ -4,7 +4,8 @@
 
 namespace hosted {
 
-/// Names of keys, values and variables, compared without regard to the case of ASCII letters.
+/// Names as the platform compares them: UTF-8, without regard to case. Letters outside of ASCII have the upper case
+/// that this system knows for them.
 
 /// True when `left` comes before `right`, in the order that both have in upper case.
 struct LessIgnoringCase {

@@ -17,6 +17,7 @@
 #include <type_traits>
 #include <vector>
 
+#include "platform/hosted/failure.h"
 #include "platform/utf8.h"
 
 namespace hosted {
@@ -29,6 +30,13 @@ constexpr const char* RegistryFileName = "registry.reg";
 
 /// Below it nothing exists and nothing can be made, whoever asks.
 constexpr const char* Nowhere = "/dev/null/nowhere";
+
+/// What stands for a name that Windows refuses: longer than any that the host takes, so the host refuses it as well,
+/// and in words that it has for nothing else.
+const std::string& RefusedName() {
+    static const std::string name(PATH_MAX, '?');
+    return name;
+}
 
 /// Characters that no name on a drive of Windows may hold, by their ASCII code. Looked up for every character of a
 /// path.
@@ -87,14 +95,23 @@ std::string MadeAndResolved(const std::string& folder) {
     return resolved;
 }
 
-void AppendAsUtf8(std::string& text, std::string_view part) {
-    text.append(part);
+/// Nearly every name is plain ASCII, which needs no conversion.
+template <class Char>
+bool IsPlain(std::basic_string_view<Char> part) {
+    return std::all_of(part.begin(), part.end(), [](Char c) { return c >= 0 && c <= 0x7F; });
 }
 
-/// Nearly every name is plain ASCII, which needs no conversion.
+/// One that is malformed is the same name in both kinds of text.
+void AppendAsUtf8(std::string& text, std::string_view part) {
+    if (IsPlain(part)) {
+        text.append(part);
+    } else {
+        text += platform::Utf8FromWide(platform::WideFromUtf8(part));
+    }
+}
+
 void AppendAsUtf8(std::string& text, std::wstring_view part) {
-    const bool plain = std::all_of(part.begin(), part.end(), [](wchar_t c) { return c >= 0 && c <= 0x7F; });
-    if (!plain) {
+    if (!IsPlain(part)) {
         text += platform::Utf8FromWide(part);
         return;
     }
@@ -132,10 +149,42 @@ bool EqualsName(const std::string& name, std::basic_string_view<Char> text) {
     return true;
 }
 
+/// Neither a drive nor a separator at its beginning.
+template <class Char>
+bool IsRelative(std::basic_string_view<Char> path) {
+    return !path.empty() && !IsSeparator(path[0]) && !(path.size() >= 2 && path[1] == Char(':') && IsLetter(path[0]));
+}
+
 template <class Char>
 bool IsRefused(Char c) {
     const auto code = static_cast<std::make_unsigned_t<Char>>(c);
     return code < RefusedCharacters.size() && RefusedCharacters[code];
+}
+
+/// Windows takes these for devices in every folder, whatever follows the first dot; COM and LPT have a number more.
+template <class Char>
+bool NamesADevice(std::basic_string_view<Char> name) {
+    name = name.substr(0, name.find(Char('.')));
+    name = name.substr(0, name.find_last_not_of(Char(' ')) + 1);
+    if (name.size() < 3 || name.size() > 7) {
+        return false;
+    }
+    for (const char* device : {"NUL", "CON", "PRN", "AUX", "CONIN$", "CONOUT$"}) {
+        if (EqualsName(device, name)) {
+            return true;
+        }
+    }
+    const bool numbered = name.size() == 4 && name[3] >= Char('1') && name[3] <= Char('9');
+    return numbered && (EqualsName("COM", name.substr(0, 3)) || EqualsName("LPT", name.substr(0, 3)));
+}
+
+bool IsFolder(const std::string& hostPath) {
+    struct stat found {};
+    return stat(hostPath.c_str(), &found) == 0 && S_ISDIR(found.st_mode);
+}
+
+bool IsThere(const std::string& hostPath) {
+    return access(hostPath.c_str(), F_OK) == 0;
 }
 
 bool IsBelowOrEqual(std::string_view path, std::string_view folder) {
@@ -205,19 +254,23 @@ public:
         if (rest_.empty() || !TakeRoot()) {
             return rest_.empty() && name_.empty() ? std::string() : Nowhere;
         }
+        const bool endsInSeparator = !rest_.empty() && IsSeparator(rest_.back());
         while (!rest_.empty()) {
             if (!TakeComponent()) {
-                return Nowhere;
+                return RefusedName();
             }
         }
         if (name_.empty()) {
             return relative_ ? "." : "/";
         }
-        return std::move(name_);
+        return endsInSeparator && checked_ && !IsFolder(name_) ? NameOfNoFolder() : std::move(name_);
     }
 
 private:
     using Text = std::basic_string_view<Char>;
+
+    /// With a separator at its end a file's name names nothing; what is missing can be made as a folder, and only so.
+    std::string NameOfNoFolder() { return IsThere(name_) ? RefusedName() : name_ + '/'; }
 
     /// Takes the drive or the leading separator. False for what no machine has.
     bool TakeRoot() {
@@ -227,14 +280,13 @@ private:
             rest_.remove_prefix(2);
             return StartAtDrive(letter);
         }
-        if (rest_[0] == Char('/')) {
-            return StartAtDrive('z');
-        }
-        if (rest_.size() >= 2 && rest_[0] == Char('\\') && IsSeparator(rest_[1])) {
+        if (rest_.size() >= 2 && IsSeparator(rest_[0]) && IsSeparator(rest_[1])) {
             return false;
         }
-        if (rest_[0] == Char('\\')) {
-            return StartAtDrive(CurrentDrive());
+        // Nothing but Z: leads out of the machine, so a path without a drive is on C:, as it is on a Windows machine
+        // with one drive.
+        if (IsSeparator(rest_[0])) {
+            return StartAtDrive('c');
         }
         relative_ = true;
         return true;
@@ -261,12 +313,7 @@ private:
             return true;
         }
         name_ = machine_.folder_ + "/drive_" + letter;
-        return access(name_.c_str(), F_OK) == 0;
-    }
-
-    char CurrentDrive() const {
-        char folder[PATH_MAX];
-        return getcwd(folder, sizeof folder) != nullptr && IsBelowOrEqual(folder, machine_.driveC_) ? 'c' : 'z';
+        return IsThere(name_);
     }
 
     /// Takes one component and the separators around it. False for a name that Windows refuses.
@@ -285,7 +332,7 @@ private:
         const Text component = rest_.substr(start, end - start);
         rest_.remove_prefix(end);
         Enter(component, last);
-        return !refused;
+        return !refused && !(checked_ && last && NamesADevice(component));
     }
 
     void Enter(Text component, bool last) {
@@ -422,11 +469,27 @@ void Machine::ArmFromEnvironment() {
     }
 }
 
+std::wstring Machine::CurrentFolderOnC() const {
+    char folder[PATH_MAX];
+    const bool isOnC = getcwd(folder, sizeof folder) != nullptr && IsBelowOrEqual(folder, driveC_);
+    return isOnC ? WindowsPath(folder) : std::wstring();
+}
+
 std::string Machine::HostPath(std::wstring_view windowsPath) const {
+    if (IsRelative(windowsPath)) {
+        if (const std::wstring folder = CurrentFolderOnC(); !folder.empty()) {
+            return HostName<wchar_t>(*this, folder + L'\\' + std::wstring(windowsPath)).Build();
+        }
+    }
     return HostName<wchar_t>(*this, windowsPath).Build();
 }
 
 std::string Machine::HostPath(std::string_view windowsPath) const {
+    if (IsRelative(windowsPath)) {
+        if (const std::wstring folder = CurrentFolderOnC(); !folder.empty()) {
+            return HostName<char>(*this, platform::Utf8FromWide(folder) + '\\' + std::string(windowsPath)).Build();
+        }
+    }
     return HostName<char>(*this, windowsPath).Build();
 }
 
@@ -445,13 +508,6 @@ std::wstring Machine::WindowsPath(std::string_view hostPath) const {
         path += c == L'/' ? L'\\' : c;
     }
     return path;
-}
-
-void EndWithMessage(const std::string& message) {
-    std::fprintf(stderr, "%s\n", message.c_str());
-    std::fflush(nullptr);
-    // No exit handlers: they would ask for the machine that cannot be.
-    _exit(1);
 }
 
 }  // namespace hosted

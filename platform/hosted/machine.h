@@ -38,11 +38,14 @@ public:
     [[nodiscard]] const std::string& Account() const { return account_; }
 
     /// The host's name of a Windows path. Both separators count, `.` and `..` are resolved in the text (never above
-    /// a drive's root), a final component loses its trailing dots and blanks. `C:` is drive_c, `Z:` and a leading `/`
-    /// are the host's root, another drive is `drive_x` in the folder if that exists. A relative path stays relative
-    /// to the process's current directory. Base folders such as `C:\Windows` are found in any case.
-    /// What Windows cannot name (a missing drive, a network share, characters that it refuses) becomes a path below
-    /// /dev/null, where nothing exists and nothing can be made.
+    /// a drive's root), a final component loses its trailing dots and blanks. `C:` is drive_c, and so is the drive of a
+    /// path that names none; `Z:` is the host's root and the one way out of the machine; another drive is `drive_x` in
+    /// the folder if that exists. A relative path begins at the process's current directory, and stays relative where
+    /// that is outside of drive_c. Base folders such as `C:\Windows` are found in any case.
+    ///
+    /// What Windows cannot find (a missing drive, a network share) becomes a path below /dev/null, where nothing exists
+    /// and nothing can be made. What it refuses (characters, names of devices, a separator behind a file's name)
+    /// becomes a name that the host refuses too.
     [[nodiscard]] std::string HostPath(std::wstring_view windowsPath) const;
     /// The same for UTF-8.
     [[nodiscard]] std::string HostPath(std::string_view windowsPath) const;
@@ -64,6 +67,8 @@ private:
     static std::unique_ptr<const BaseFolder> BaseFoldersOf(const std::string& account);
     static void MakeFolders(const BaseFolder& folder, const std::string& hostPath);
     void ArmFromEnvironment();
+    /// The Windows path of the process's current directory; empty where that is outside of drive_c.
+    [[nodiscard]] std::wstring CurrentFolderOnC() const;
 
     std::string folder_;
     std::string driveC_;
@@ -73,8 +78,5 @@ private:
     Environment environment_;
     Registry registry_;
 };
-
-/// Ends the process with exit status 1 and the message on standard error: the machine cannot be what it promises.
-[[noreturn]] void EndWithMessage(const std::string& message);
 
 }  // namespace hosted

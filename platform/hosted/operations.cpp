@@ -8,8 +8,10 @@
 #include <cstdio>
 #include <cstdlib>
 
+#include "platform/hosted/failure.h"
 #include "platform/hosted/file_error.h"
 #include "platform/hosted/folder.h"
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/machine.h"
 
 namespace hosted::filesystem {
@@ -28,7 +30,7 @@ int Check(Operation operation, const std::string& hostName, std::uint64_t bytes 
 }
 
 bool MeansMissing(int number) {
-    return number == ENOENT || number == ENOTDIR;
+    return number == ENOENT || number == ENOTDIR || number == ENAMETOOLONG;
 }
 
 /// The errno of a call that gives 0 or -1.
@@ -66,10 +68,6 @@ bool IsDirectoryOnHost(const std::string& hostName) {
     return ::stat(hostName.c_str(), &found) == 0 && S_ISDIR(found.st_mode);
 }
 
-bool IsReadOnly(const Stat& found) {
-    return (found.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH)) == 0;
-}
-
 std::uintmax_t AskSize(const path& file, error_code* error) {
     Stat found{};
     int number = ErrorOf(::stat(HostName(file).c_str(), &found));
@@ -98,6 +96,9 @@ int RenameOverExisting(const std::string& from, const std::string& to) {
     if (taken && !itself && (S_ISDIR(target.st_mode) || IsReadOnly(target))) {
         return EACCES;
     }
+    if (taken && !itself && IsOpenSomewhere(to)) {
+        return EBUSY;
+    }
     if (taken && !itself && S_ISDIR(source.st_mode)) {
         return ReplaceFileByFolder(from, to);
     }
@@ -108,43 +109,12 @@ int RenameOnHost(const std::string& from, const std::string& to) {
     if (const int number = Machine::Current().GetFaults().CheckRename(from, to); number != 0) {
         return number;
     }
+    if (IsOpenSomewhere(from)) {
+        return EBUSY;
+    }
     // Nearly always the new name is free, and one call does. Some file systems do not know the flag: EINVAL.
     const int number = ErrorOf(::renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE));
     return number == EEXIST || number == EINVAL ? RenameOverExisting(from, to) : number;
-}
-
-class Descriptor {
-public:
-    explicit Descriptor(int number) : number_(number) {}
-    ~Descriptor() { Close(); }
-    Descriptor(const Descriptor&) = delete;
-    Descriptor& operator=(const Descriptor&) = delete;
-
-    [[nodiscard]] bool IsOpen() const { return number_ >= 0; }
-    [[nodiscard]] int Get() const { return number_; }
-    /// 0, or the errno: what was written may turn out lost only now.
-    int Close() {
-        const int number = number_;
-        number_ = -1;
-        return number < 0 ? 0 : ErrorOf(::close(number));
-    }
-
-private:
-    int number_;
-};
-
-int WriteAll(int target, const char* bytes, std::size_t count) {
-    while (count > 0) {
-        const ssize_t written = ::write(target, bytes, count);
-        if (written < 0 && errno != EINTR) {
-            return errno;
-        }
-        if (written > 0) {
-            bytes += written;
-            count -= static_cast<std::size_t>(written);
-        }
-    }
-    return 0;
 }
 
 int CopyThroughBuffer(int source, int target, off_t expected) {
@@ -162,7 +132,7 @@ int CopyThroughBuffer(int source, int target, off_t expected) {
             }
             return errno;
         }
-        if (const int number = WriteAll(target, buffer.data(), static_cast<std::size_t>(count)); number != 0) {
+        if (const int number = WriteAll(target, {buffer.data(), static_cast<std::size_t>(count)}); number != 0) {
             return number;
         }
         copied += count;
@@ -292,6 +262,9 @@ int RemoveOne(const std::string& hostName, bool isFolder) {
     if (const int number = Check(Operation::Delete, hostName); number != 0) {
         return number;
     }
+    if (!isFolder && IsOpenSomewhere(hostName)) {
+        return EBUSY;
+    }
     return ErrorOf(isFolder ? ::rmdir(hostName.c_str()) : ::unlink(hostName.c_str()));
 }
 
@@ -309,14 +282,14 @@ bool Remove(const path& item, error_code* error) {
 /// Counts what it removes; an item that is gone already counts as none.
 int RemoveTree(const std::string& hostName, file_type type, std::uintmax_t& count) {
     if (type == directory_file) {
-        Folder folder(hostName);
-        int number = folder.Error();
-        while (number == 0 && folder.Next()) {
-            number = RemoveTree(hostName + "/" + folder.Name(), folder.Type(), count);
+        const Folder folder(hostName);
+        if (folder.Error() != 0) {
+            return folder.Error();
         }
-        number = number != 0 ? number : folder.Error();
-        if (number != 0) {
-            return number;
+        for (const Folder::Entry& entry : folder.Entries()) {
+            if (const int number = RemoveTree(hostName + "/" + entry.name, entry.type, count); number != 0) {
+                return number;
+            }
         }
     }
     const int number = RemoveOne(hostName, type == directory_file);
@@ -361,6 +334,8 @@ path Absolute(const path& item, const path& base) {
     }
     path result = item.has_root_name() ? item.root_name() : base.root_name();
     if (item.has_root_directory()) {
+        // What names no drive is on the machine's, wherever on the host the current folder is.
+        result = result == path("Z:") && !item.has_root_name() ? path("C:") : result;
         result += item.root_directory();
     } else {
         result += base.root_directory();
@@ -388,7 +363,7 @@ filesystem_error::filesystem_error(const std::string& operation, const path& fir
           Details{first, second, system_error::what() + Describe(first, ": ") + Describe(second, ", ")})) {}
 
 void Report(int number, error_code* error, const char* operation, const path& first, const path& second) {
-    const error_code code(number, boost::system::system_category());
+    const error_code code(number == 0 ? 0 : FailureOf(number).library, boost::system::system_category());
     if (error != nullptr) {
         *error = number == 0 ? error_code() : code;
     } else if (number != 0) {

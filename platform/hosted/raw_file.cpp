@@ -7,24 +7,25 @@
 #include <cerrno>
 #include <string>
 
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/machine.h"
 
 namespace platform {
 namespace {
 
+using hosted::Descriptor;
 using hosted::Machine;
 using hosted::Operation;
 
 class HostFile : public RawFile {
 public:
-    HostFile(int descriptor, std::string name) : descriptor_(descriptor), name_(std::move(name)) {}
-    ~HostFile() override { HostFile::Close(); }
+    HostFile(Descriptor descriptor, std::string name) : descriptor_(std::move(descriptor)), name_(std::move(name)) {}
 
     std::int64_t ReadAt(std::uint64_t place, void* bytes, std::size_t count) override {
         std::size_t done = 0;
         while (done < count) {
-            const ssize_t got =
-                ::pread(descriptor_, static_cast<char*>(bytes) + done, count - done, static_cast<off_t>(place + done));
+            const ssize_t got = ::pread(descriptor_.Get(), static_cast<char*>(bytes) + done, count - done,
+                                        static_cast<off_t>(place + done));
             if (got < 0 && errno != EINTR) {
                 return -1;
             }
@@ -42,7 +43,7 @@ public:
         }
         std::size_t done = 0;
         while (done < count) {
-            const ssize_t put = ::pwrite(descriptor_, static_cast<const char*>(bytes) + done, count - done,
+            const ssize_t put = ::pwrite(descriptor_.Get(), static_cast<const char*>(bytes) + done, count - done,
                                          static_cast<off_t>(place + done));
             if (put < 0 && errno != EINTR) {
                 return false;
@@ -54,23 +55,19 @@ public:
 
     [[nodiscard]] std::uint64_t Size() const override {
         struct stat found {};
-        return ::fstat(descriptor_, &found) == 0 ? static_cast<std::uint64_t>(found.st_size) : 0;
+        return ::fstat(descriptor_.Get(), &found) == 0 ? static_cast<std::uint64_t>(found.st_size) : 0;
     }
 
-    bool Close() override {
-        const int descriptor = descriptor_;
-        descriptor_ = -1;
-        return descriptor < 0 || ::close(descriptor) == 0;
-    }
+    bool Close() override { return descriptor_.Close() == 0; }
 
 private:
-    int descriptor_;
+    Descriptor descriptor_;
     std::string name_;
 };
 
 bool IsReadOnly(const std::string& name) {
     struct stat found {};
-    return ::stat(name.c_str(), &found) == 0 && (found.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH)) == 0;
+    return ::stat(name.c_str(), &found) == 0 && hosted::IsReadOnly(found);
 }
 
 int OpenFlags(RawFile::Mode mode) {
@@ -100,12 +97,12 @@ std::unique_ptr<RawFile> OpenRawFile(const wchar_t* windowsName, RawFile::Mode m
         return nullptr;
     }
     // Without waiting: opening a pipe must not hang before it is seen to be none of ours.
-    const int descriptor = ::open(name.c_str(), OpenFlags(mode) | O_CLOEXEC | O_NONBLOCK, 0666);
-    if (descriptor < 0) {
+    Descriptor descriptor(::open(name.c_str(), OpenFlags(mode) | O_CLOEXEC | O_NONBLOCK, 0666));
+    if (!descriptor.IsOpen() || !IsOrdinary(descriptor.Get())) {
         return nullptr;
     }
-    auto file = std::make_unique<HostFile>(descriptor, std::move(name));
-    return IsOrdinary(descriptor) ? std::move(file) : nullptr;
+    hosted::MarkAsOpen(descriptor.Get());
+    return std::make_unique<HostFile>(std::move(descriptor), std::move(name));
 }
 
 }  // namespace platform

@@ -11,9 +11,11 @@
 #include <fstream>
 #include <sstream>
 
+#include "platform/hosted/failure.h"
 #include "platform/hosted/faults.h"
-#include "platform/hosted/machine.h"
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/win32.h"
+#include "platform/utf8.h"
 
 namespace hosted {
 namespace {
@@ -21,7 +23,9 @@ namespace {
 constexpr std::string_view LocalMachine = "HKEY_LOCAL_MACHINE";
 constexpr std::string_view CurrentUser = "HKEY_CURRENT_USER";
 constexpr std::string_view Users = "HKEY_USERS";
+/// In characters of UTF-16.
 constexpr std::size_t LongestKeyName = 255;
+constexpr std::size_t LongestValueName = 16383;
 
 /// Two hives are views of keys elsewhere; they are kept, and written, only there.
 struct Alias {
@@ -72,9 +76,20 @@ std::string_view TakeName(std::string_view& path) {
     return name;
 }
 
+/// True when the name has more characters of UTF-16. None has more than it has bytes, so most need not be looked at.
+bool IsLongerThan(std::size_t most, std::string_view name) {
+    if (name.size() <= most) {
+        return false;
+    }
+    const std::wstring wide = platform::WideFromUtf8(name);
+    const auto pairs = std::count_if(wide.begin(), wide.end(), [](wchar_t c) { return c > 0xFFFF; });
+    return wide.size() + static_cast<std::size_t>(pairs) > most;
+}
+
 /// A name that the registry refuses, or that a line of registry text cannot hold.
 bool IsBadName(std::string_view name) {
-    return name.size() > LongestKeyName || name.find_first_of(std::string_view("\r\n\0", 3)) != std::string_view::npos;
+    return IsLongerThan(LongestKeyName, name) ||
+           name.find_first_of(std::string_view("\r\n\0", 3)) != std::string_view::npos;
 }
 
 bool HasBadName(std::string_view path) {
@@ -84,17 +99,6 @@ bool HasBadName(std::string_view path) {
         }
     }
     return false;
-}
-
-bool WriteAll(int descriptor, std::string_view text) {
-    while (!text.empty()) {
-        const ssize_t written = write(descriptor, text.data(), text.size());
-        if (written < 0) {
-            return false;
-        }
-        text.remove_prefix(static_cast<std::size_t>(written));
-    }
-    return true;
 }
 
 }  // namespace
@@ -177,11 +181,7 @@ Registry::Registry(std::string file, Faults& faults) : file_(std::move(file)), f
     ReadFile();
 }
 
-Registry::~Registry() {
-    if (appendTo_ >= 0) {
-        close(appendTo_);
-    }
-}
+Registry::~Registry() = default;
 
 std::int32_t Registry::CreateKey(Handle parent, std::string_view subKey, std::uint32_t access, Handle& result,
                                  bool& created) {
@@ -274,6 +274,9 @@ std::int32_t Registry::SetValue(Handle handle, std::string_view name, RegistryVa
     if (const std::int32_t error = Resolve(handle, KEY_SET_VALUE, key)) {
         return error;
     }
+    if (IsLongerThan(LongestValueName, name)) {
+        return ERROR_INVALID_PARAMETER;
+    }
     if (const std::int32_t error = Prepare(KeyLine(key->Path()) + ValueLine(name, value.type, value.data))) {
         return error;
     }
@@ -339,10 +342,7 @@ void Registry::LoadText(std::string_view text, const std::string& nameForErrors)
 
 void Registry::Reload() {
     const std::lock_guard guard(mutex_);
-    if (appendTo_ >= 0) {
-        close(appendTo_);
-        appendTo_ = -1;
-    }
+    appendTo_.Close();
     ReadFile();
 }
 
@@ -357,21 +357,16 @@ void Registry::Flush() {
         return;
     }
     const std::string fresh = file_ + ".new";
-    const int descriptor = open(fresh.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
-    const bool written = descriptor >= 0 && WriteAll(descriptor, TextLocked());
-    if (descriptor >= 0) {
-        close(descriptor);
-    }
+    Descriptor descriptor(open(fresh.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666));
+    const bool written = descriptor.IsOpen() && WriteAll(descriptor.Get(), TextLocked()) == 0;
+    descriptor.Close();
     if (!written || rename(fresh.c_str(), file_.c_str()) != 0) {
         std::fprintf(stderr, "cannot write the registry file %s: %s\n", file_.c_str(), std::strerror(errno));
         unlink(fresh.c_str());
         return;
     }
     // The old file is gone from its name; what comes next belongs into the new one.
-    if (appendTo_ >= 0) {
-        close(appendTo_);
-        appendTo_ = -1;
-    }
+    appendTo_.Close();
     changed_ = false;
 }
 
@@ -499,16 +494,16 @@ void Registry::ReadFile() {
 
 bool Registry::Append(const std::string& section) {
     changed_ = true;
-    if (appendTo_ < 0) {
-        appendTo_ = open(file_.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0666);
-        if (appendTo_ < 0) {
+    if (!appendTo_.IsOpen()) {
+        appendTo_ = Descriptor(open(file_.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0666));
+        if (!appendTo_.IsOpen()) {
             return false;
         }
-        if (lseek(appendTo_, 0, SEEK_END) == 0 && !WriteAll(appendTo_, RegistryTextHeader())) {
+        if (lseek(appendTo_.Get(), 0, SEEK_END) == 0 && WriteAll(appendTo_.Get(), RegistryTextHeader()) != 0) {
             return false;
         }
     }
-    return section.empty() || WriteAll(appendTo_, "\n" + section);
+    return section.empty() || WriteAll(appendTo_.Get(), "\n" + section) == 0;
 }
 
 std::string Registry::TextLocked() const {

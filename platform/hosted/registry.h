@@ -9,6 +9,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/ignoring_case.h"
 #include "platform/hosted/registry_text.h"
 
@@ -85,7 +86,7 @@ private:
     KeyPointer root_;
     std::unordered_map<Handle, OpenedKey> handles_;
     Handle nextHandle_ = 4;
-    int appendTo_ = -1;
+    Descriptor appendTo_;
     bool changed_ = false;
 };
 

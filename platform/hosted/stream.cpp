@@ -9,6 +9,8 @@
 #include <string>
 #include <string_view>
 
+#include "platform/hosted/failure.h"
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/machine.h"
 #include "platform/hosted/win32.h"
 
@@ -57,8 +59,7 @@ std::optional<Mode> ParseMode(std::string_view text) {
 /// A descriptor, or -1 and errno. Windows opens no folder as a file, and no read-only file for writing, whoever asks.
 int OpenExisting(const std::string& hostPath, const Mode& mode) {
     Stat found{};
-    if (mode.Writes() && stat(hostPath.c_str(), &found) == 0 &&
-        (S_ISDIR(found.st_mode) || (found.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH)) == 0)) {
+    if (mode.Writes() && stat(hostPath.c_str(), &found) == 0 && (S_ISDIR(found.st_mode) || hosted::IsReadOnly(found))) {
         errno = EACCES;
         return -1;
     }
@@ -81,6 +82,10 @@ int Open(const std::string& hostPath, const Mode& mode) {
     if (mode.kind != 'r') {
         // Nearly every file that is written is new.
         const int descriptor = open(hostPath.c_str(), mode.Flags() | O_CREAT | O_EXCL, 0666);
+        if (descriptor < 0 && errno == EISDIR) {
+            // The name ends in a separator, and there is no folder of that name.
+            errno = ENAMETOOLONG;
+        }
         if (descriptor >= 0 || errno != EEXIST) {
             return descriptor;
         }
@@ -141,18 +146,14 @@ public:
 private:
     bool WriteAll(std::string_view bytes) {
         Faults& faults = Machine::Current().GetFaults();
-        if (const int error = faults.Check(Operation::Write, hostPath_, bytes.size())) {
+        int error = faults.Check(Operation::Write, hostPath_, bytes.size());
+        if (error == 0) {
+            error = hosted::WriteAll(descriptor_, bytes);
+        }
+        if (error != 0) {
             errno = error;
-            return false;
         }
-        while (!bytes.empty()) {
-            const ssize_t written = write(descriptor_, bytes.data(), bytes.size());
-            if (written < 0 && errno != EINTR) {
-                return false;
-            }
-            bytes.remove_prefix(written < 0 ? 0 : static_cast<std::size_t>(written));
-        }
-        return true;
+        return error == 0;
     }
 
     /// CR LF is a line's end, a lone CR is itself, and Ctrl-Z ends the text wherever it stands.
@@ -212,10 +213,6 @@ FILE* FilteredStream(int descriptor, const std::string& hostPath, const Mode& mo
     return stream;
 }
 
-errno_t RuntimeError(int number) {
-    return number == ENOTDIR ? ENOENT : number == EISDIR || number == EIO ? EACCES : number;
-}
-
 }  // namespace
 
 errno_t fopen_s(FILE** stream, const char* path, const char* mode) {
@@ -230,15 +227,16 @@ errno_t fopen_s(FILE** stream, const char* path, const char* mode) {
     const std::string hostPath = Machine::Current().HostPath(std::string_view(path));
     const int descriptor = Open(hostPath, *parsed);
     if (descriptor < 0) {
-        return RuntimeError(errno);
+        return hosted::FailureOf(errno).runtime;
     }
+    hosted::MarkAsOpen(descriptor);
     const bool mayFail = parsed->Writes() && Machine::Current().GetFaults().Armed();
     *stream = parsed->text || mayFail ? FilteredStream(descriptor, hostPath, *parsed)
                                       : fdopen(descriptor, parsed->Name().c_str());
     if (*stream == nullptr) {
         const int error = errno;
         close(descriptor);
-        return RuntimeError(error);
+        return hosted::FailureOf(error).runtime;
     }
     return 0;
 }

@@ -12,6 +12,7 @@
 #include <string_view>
 #include <vector>
 
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/machine.h"
 
 namespace {
@@ -32,17 +33,10 @@ public:
     // A pipe must not make the reader wait for a writer, hence O_NONBLOCK; it is turned away below.
     explicit File(const std::string& name) : handle(open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {
         struct stat status {};
-        if (handle >= 0 && fstat(handle, &status) == 0 && S_ISREG(status.st_mode)) {
+        if (handle.IsOpen() && fstat(handle.Get(), &status) == 0 && S_ISREG(status.st_mode)) {
             size = static_cast<std::uint64_t>(status.st_size);
         }
     }
-    ~File() {
-        if (handle >= 0) {
-            close(handle);
-        }
-    }
-    File(const File&) = delete;
-    File& operator=(const File&) = delete;
 
     std::optional<Bytes> Read(std::uint64_t offset, std::size_t count) const {
         // Asked before memory is taken: a garbled length must not cost more than the file is long.
@@ -51,7 +45,8 @@ public:
         }
         Bytes bytes(count);
         for (std::size_t done = 0; done < count;) {
-            const ssize_t got = pread(handle, bytes.data() + done, count - done, static_cast<off_t>(offset + done));
+            const ssize_t got =
+                pread(handle.Get(), bytes.data() + done, count - done, static_cast<off_t>(offset + done));
             if (got <= 0) {
                 return std::nullopt;
             }
@@ -61,7 +56,7 @@ public:
     }
 
 private:
-    int handle;
+    hosted::Descriptor handle;
     std::uint64_t size = 0;
 };
 

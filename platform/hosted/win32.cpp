@@ -8,6 +8,8 @@
 #include <optional>
 #include <string>
 
+#include "platform/hosted/failure.h"
+#include "platform/hosted/host_file.h"
 #include "platform/hosted/machine.h"
 
 namespace {
@@ -18,31 +20,8 @@ using Stat = struct stat;
 
 thread_local DWORD lastError = 0;
 
-/// What Windows and its runtime say where the host says `number`. A path through a file is a missing path there.
-struct Failure {
-    int runtime;
-    LONG system;
-};
-
-Failure FailureOf(int number) {
-    switch (number) {
-        case ENOENT:
-            return {ENOENT, ERROR_FILE_NOT_FOUND};
-        case ENOTDIR:
-            return {ENOENT, ERROR_PATH_NOT_FOUND};
-        case EEXIST:
-            return {EEXIST, ERROR_ALREADY_EXISTS};
-        case ENOTEMPTY:
-            return {ENOTEMPTY, ERROR_DIR_NOT_EMPTY};
-        case ENOSPC:
-            return {ENOSPC, ERROR_DISK_FULL};
-        default:
-            return {EACCES, ERROR_ACCESS_DENIED};
-    }
-}
-
 int Fail(int number) {
-    const Failure failure = FailureOf(number);
+    const hosted::Failure failure = hosted::FailureOf(number);
     SetLastError(static_cast<DWORD>(failure.system));
     errno = failure.runtime;
     return -1;
@@ -54,12 +33,13 @@ int RefusalToDelete(const std::string& hostPath) {
     if (lstat(hostPath.c_str(), &found) != 0) {
         return errno;
     }
-    // Windows refuses to delete a read-only file whoever asks; the host asks the folder, and lets root do anything.
-    const bool readOnly = S_ISREG(found.st_mode) && (found.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH)) == 0;
-    if (S_ISDIR(found.st_mode) || readOnly) {
+    if (S_ISDIR(found.st_mode) || (S_ISREG(found.st_mode) && hosted::IsReadOnly(found))) {
         return EACCES;
     }
-    return Machine::Current().GetFaults().Check(Operation::Delete, hostPath);
+    if (const int error = Machine::Current().GetFaults().Check(Operation::Delete, hostPath)) {
+        return error;
+    }
+    return hosted::IsOpenSomewhere(hostPath) ? EBUSY : 0;
 }
 
 bool IsLinkToFolder(const std::string& hostPath) {

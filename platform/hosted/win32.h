@@ -50,6 +50,7 @@ using LPSECURITY_ATTRIBUTES = SECURITY_ATTRIBUTES*;
 inline constexpr LONG ERROR_SUCCESS = 0;
 inline constexpr LONG ERROR_FILE_NOT_FOUND = 2;
 inline constexpr LONG ERROR_PATH_NOT_FOUND = 3;
+inline constexpr LONG ERROR_TOO_MANY_OPEN_FILES = 4;
 inline constexpr LONG ERROR_ACCESS_DENIED = 5;
 inline constexpr LONG ERROR_INVALID_HANDLE = 6;
 inline constexpr LONG ERROR_INVALID_DATA = 13;
@@ -58,6 +59,7 @@ inline constexpr LONG ERROR_SHARING_VIOLATION = 32;
 inline constexpr LONG ERROR_INVALID_PARAMETER = 87;
 inline constexpr LONG ERROR_DISK_FULL = 112;
 inline constexpr LONG ERROR_INSUFFICIENT_BUFFER = 122;
+inline constexpr LONG ERROR_INVALID_NAME = 123;
 inline constexpr LONG ERROR_DIR_NOT_EMPTY = 145;
 inline constexpr LONG ERROR_BAD_PATHNAME = 161;
 inline constexpr LONG ERROR_ALREADY_EXISTS = 183;
@@ -147,10 +149,12 @@ LSTATUS RegSetKeyValueA(HKEY key, LPCSTR subKey, LPCSTR name, DWORD type, LPCVOI
 /// Deletes `subKey` with all below it; without a `subKey` everything below `key`, and its values, but not `key`.
 LSTATUS RegDeleteTreeA(HKEY key, LPCSTR subKey);
 
-// The runtime's file calls. A read-only file refuses writing and deleting, whoever asks.
+// The runtime's file calls. A read-only file refuses writing and deleting, whoever asks, and a file that is open
+// refuses deleting.
 
 /// Text mode writes LF as CR LF and reads CR LF as LF; "b" in `mode` switches that off. The stream is then used and
-/// closed with the plain calls of <cstdio>. Returns 0, or an errno with `*stream` null.
+/// closed with the plain calls of <cstdio>. Returns 0, or an errno with `*stream` null. A `mode` is r, w or a, and
+/// after it any of +, b and t.
 errno_t fopen_s(FILE** stream, const char* path, const char* mode);
 int _mkdir(const char* path);
 int _unlink(const char* path);

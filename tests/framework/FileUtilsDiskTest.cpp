@@ -6,6 +6,7 @@
 
 #include "hvframework/FileUtils.h"
 #include "platform/filesystem.h"
+#include "platform/win32.h"
 #include "tests/support/CapturedStreams.h"
 #include "tests/support/Machine.h"
 
@@ -143,6 +144,19 @@ TEST_F(Deleting, TakesATrailingSeparator) {
 
 TEST_F(Deleting, RemovesNamesBeyondAscii) {
     machine.Has("C:\\T\\d\\\xc3\xa4\xe6\xbc\xa2\\\xf0\x9f\x8e\xac.txt", "x");
+    EXPECT_EQ(DeleteFileOrDirectory(R"(C:\T\d)"), 0);
+    EXPECT_FALSE(machine.Exists(R"(C:\T\d)"));
+}
+
+// Such a name is another one on the disk, with a character in place of what is malformed, and is listed so.
+TEST_F(Deleting, RemovesFilesThatWereWrittenUnderMalformedNames) {
+    machine.HasFolder(R"(C:\T\d)");
+    for (const char* name : {"C:\\T\\d\\a\xFF\xFE", "C:\\T\\d\\\xC3"}) {
+        FILE* stream = nullptr;
+        ASSERT_EQ(fopen_s(&stream, name, "wb"), 0) << name;
+        std::fclose(stream);
+    }
+    ASSERT_EQ(machine.FilesWithoutFolders().size(), 2U);
     EXPECT_EQ(DeleteFileOrDirectory(R"(C:\T\d)"), 0);
     EXPECT_FALSE(machine.Exists(R"(C:\T\d)"));
 }

@@ -3,8 +3,11 @@
 #include <functional>
 #include <set>
 #include <string>
+#include <vector>
 
 #include "platform/filesystem.h"
+#include "platform/raw_file.h"
+#include "platform/win32.h"
 #include "tests/support/Machine.h"
 
 namespace {
@@ -290,6 +293,78 @@ TEST_F(FilesTest, ListsAFolderWithoutItselfAndItsParent) {
     machine.Has(In("folder\\below"), "x");
     EXPECT_EQ(NamesIn(Folder), (std::set<std::string>{"file", "folder"}));
     EXPECT_TRUE(NamesIn(In("folder\\..\\folder")).contains("below"));
+}
+
+TEST_F(FilesTest, ListsNamesInTheOrderOfTheirUpperCase) {
+    const std::vector<std::string> sorted = {"-",   "1", "10", "2",  "A",  "a b", "a-b",      "a.b",     "a1",
+                                             "a_b", "b", "Z",  "z1", "_x", "~",   "\xC3\x84", "\xC3\xBC"};
+    for (std::size_t at = 0; at < sorted.size(); ++at) {
+        machine.Has(In(sorted[(at * 5) % sorted.size()]), "x");
+    }
+    std::vector<std::string> listed;
+    for (const fs::directory_entry& entry : fs::directory_iterator(Folder)) {
+        listed.push_back(entry.path().filename().string());
+    }
+    EXPECT_EQ(listed, sorted);
+    std::vector<std::string> walked;
+    for (fs::recursive_directory_iterator i(Folder), end; i != end; ++i) {
+        walked.push_back(i->path().filename().string());
+    }
+    EXPECT_EQ(walked, sorted);
+}
+
+TEST_F(FilesTest, AFileWithASeparatorBehindItsNameIsNotThere) {
+    machine.Has(In("file"), "x");
+    machine.HasFolder(In("folder"));
+    int ran = 0;
+    for (const char* separator : {"\\", "/", "\\\\"}) {
+        EXPECT_FALSE(fs::exists(In("file") + separator)) << separator;
+        EXPECT_FALSE(fs::is_regular_file(In("file") + separator)) << separator;
+        EXPECT_TRUE(fs::is_directory(In("folder") + separator)) << separator;
+        EXPECT_TRUE(CopyError("file", std::string("new") + separator)) << separator;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 3);
+    EXPECT_TRUE(fs::create_directory(In("new\\")));
+    EXPECT_EQ(NamesIn(Folder), (std::set<std::string>{"file", "folder", "new"}));
+}
+
+TEST_F(FilesTest, AnOpenFileIsNeitherRemovedNorRenamedNorReplaced) {
+    machine.Has(In("open"), "open");
+    machine.Has(In("other"), "other");
+    FILE* stream = nullptr;
+    ASSERT_EQ(fopen_s(&stream, In("open").c_str(), "rb"), 0);
+    error_code code;
+    EXPECT_FALSE(fs::remove(In("open"), code));
+    EXPECT_EQ(code, errc::permission_denied);
+    EXPECT_EQ(RenameError("open", "new"), errc::permission_denied);
+    EXPECT_TRUE(RenameError("other", "open"));
+    EXPECT_TRUE(fs::copy_file(In("open"), In("copy")));
+    std::fclose(stream);
+    EXPECT_EQ(machine.Content(In("open")), "open");
+    EXPECT_FALSE(RenameError("other", "open"));
+    EXPECT_TRUE(fs::remove(In("open")));
+}
+
+TEST_F(FilesTest, AnOpenArchiveIsNotRemoved) {
+    machine.Has(In("open"), "open");
+    auto archive = platform::OpenRawFile(fs::path(In("open")).c_str(), platform::RawFile::Mode::Read);
+    ASSERT_NE(archive, nullptr);
+    error_code code;
+    EXPECT_FALSE(fs::remove(In("open"), code));
+    archive.reset();
+    EXPECT_TRUE(fs::remove(In("open"), code));
+}
+
+TEST_F(FilesTest, NoFileIsMadeUnderTheNameOfADevice) {
+    machine.Has(In("file"), "content");
+    int ran = 0;
+    for (const char* name : {"con", "CON.txt", "Prn", "aux.tar.gz"}) {
+        EXPECT_TRUE(RenameError("file", name)) << name;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 4);
+    EXPECT_EQ(NamesIn(Folder), (std::set<std::string>{"file"}));
 }
 
 TEST_F(FilesTest, JoinsListedNamesToThePathAsItWasGiven) {

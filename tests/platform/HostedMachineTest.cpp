@@ -4,7 +4,9 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <climits>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -14,6 +16,8 @@
 #include <thread>
 #include <vector>
 
+#include "platform/arguments.h"
+#include "platform/filesystem.h"
 #include "platform/hosted/machine.h"
 #include "platform/utf8.h"
 #include "platform/win32.h"
@@ -39,6 +43,8 @@ protected:
     static std::string Folder() { return Current().Folder(); }
     static std::string RegistryFile() { return Folder() + "/registry.reg"; }
     static std::string DriveC(const std::string& rest) { return Folder() + "/drive_c" + rest; }
+    /// What the host refuses for its length, whoever asks.
+    static std::string Refused() { return std::string(PATH_MAX, '?'); }
     static std::string User() { return "/users/" + Current().Account(); }
 
     Machine machine;
@@ -55,7 +61,7 @@ TEST_F(HostedMachineTest, FindsEveryPathOnTheHost) {
                                      {L"C:\\", DriveC("")},
                                      {L"c:/", DriveC("")},
                                      {L"C:\\a\\b.txt", DriveC("/a/b.txt")},
-                                     {L"C:/a//b\\\\c/", DriveC("/a/b/c")},
+                                     {L"C:/a//b\\\\c", DriveC("/a/b/c")},
                                      {L"C:a", DriveC("/a")},
                                      {L"C:\\a\\.\\b\\..\\c", DriveC("/a/c")},
                                      {L"C:\\..\\..\\etc", DriveC("/etc")},
@@ -70,27 +76,37 @@ TEST_F(HostedMachineTest, FindsEveryPathOnTheHost) {
                                      {L"z:\\tmp\\x", "/tmp/x"},
                                      {L"Z:\\..\\tmp", "/tmp"},
                                      {L"Z:\\a:b", "/a:b"},
-                                     {L"/", "/"},
-                                     {L"/tmp/x", "/tmp/x"},
-                                     {L"/tmp\\x", "/tmp/x"},
+                                     {L"/", DriveC("")},
+                                     {L"\\", DriveC("")},
+                                     {L"/tmp/x", DriveC("/tmp/x")},
+                                     {L"/tmp\\x", DriveC("/tmp/x")},
+                                     {L"\\tmp/x", DriveC("/tmp/x")},
+                                     {L"/../../x", DriveC("/x")},
                                      {L"", ""},
                                      {L".", "."},
                                      {L"a\\b", "a/b"},
                                      {L"a\\..\\b", "b"},
                                      {L"..\\a\\..\\..\\b", "../../b"},
                                      {L"\\\\server\\share\\x", "/dev/null/nowhere"},
-                                     {L"//tmp/x", "/tmp/x"},
+                                     {L"//tmp/x", "/dev/null/nowhere"},
+                                     {L"\\/tmp/x", "/dev/null/nowhere"},
                                      {L"Q:\\x", "/dev/null/nowhere"},
-                                     {L"C:\\a:b", "/dev/null/nowhere"},
-                                     {L"C:\\a?\\b", "/dev/null/nowhere"},
-                                     {L"C:\\a\tb", "/dev/null/nowhere"}};
+                                     {L"C:\\a:b", Refused()},
+                                     {L"C:\\a?\\b", Refused()},
+                                     {L"C:\\a\tb", Refused()},
+                                     {L"C:\\a\\nul", Refused()},
+                                     {L"C:\\nul .x", Refused()},
+                                     {L"C:\\Com9.log", Refused()},
+                                     {L"C:\\com0", DriveC("/com0")},
+                                     {L"C:\\nulls", DriveC("/nulls")},
+                                     {L"C:\\aux\\x", DriveC("/aux/x")}};
     std::size_t ran = 0;
     for (const Name& name : names) {
         EXPECT_EQ(Current().HostPath(name.windows), name.host);
         EXPECT_EQ(Current().HostPath(platform::Utf8FromWide(name.windows)), name.host);
         ++ran;
     }
-    EXPECT_EQ(ran, 33u);
+    EXPECT_EQ(ran, 43u);
 }
 
 TEST_F(HostedMachineTest, FindsBaseFoldersInAnyCase) {
@@ -123,13 +139,76 @@ TEST_F(HostedMachineTest, HasASecondDriveWhenItsFolderIsThere) {
     EXPECT_EQ(Current().HostPath(std::wstring(L"D:\\x")), Folder() + "/drive_d/x");
 }
 
-TEST_F(HostedMachineTest, TakesALeadingBackslashForTheCurrentDrivesRoot) {
-    const std::filesystem::path before = std::filesystem::current_path();
-    std::filesystem::current_path("/");
-    EXPECT_EQ(Current().HostPath(std::wstring(L"\\x")), "/x");
-    std::filesystem::current_path(DriveC("/users"));
-    EXPECT_EQ(Current().HostPath(std::wstring(L"\\x")), DriveC("/x"));
-    std::filesystem::current_path(before);
+/// The process's current directory while it lives.
+class WorksIn {
+public:
+    explicit WorksIn(const std::filesystem::path& folder) { std::filesystem::current_path(folder); }
+    ~WorksIn() { std::filesystem::current_path(before_); }
+    WorksIn(const WorksIn&) = delete;
+    WorksIn& operator=(const WorksIn&) = delete;
+
+private:
+    std::filesystem::path before_ = std::filesystem::current_path();
+};
+
+TEST_F(HostedMachineTest, APathWithoutADriveIsOnDriveCWhereverTheCurrentFolderIs) {
+    std::size_t ran = 0;
+    for (const std::string& folder : {std::string("/"), Folder(), DriveC("/users")}) {
+        const WorksIn work(folder);
+        EXPECT_EQ(Current().HostPath(std::wstring(L"\\x")), DriveC("/x")) << folder;
+        EXPECT_EQ(fs::absolute("\\x").native(), L"C:\\x") << folder;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 3u);
+}
+
+TEST_F(HostedMachineTest, ARelativePathDoesNotClimbOutOfDriveC) {
+    const WorksIn work(DriveC("/users"));
+    const std::vector<Name> names = {{L"x", DriveC("/users/x")},           {L"..\\x", DriveC("/x")},
+                                     {L"..\\..\\..\\..\\x", DriveC("/x")}, {L".", DriveC("/users")},
+                                     {L"..\\WINDOWS", DriveC("/windows")}, {L"a?b", Refused()}};
+    std::size_t ran = 0;
+    for (const Name& name : names) {
+        EXPECT_EQ(Current().HostPath(name.windows), name.host);
+        EXPECT_EQ(Current().HostPath(platform::Utf8FromWide(name.windows)), name.host);
+        ++ran;
+    }
+    EXPECT_EQ(ran, 6u);
+}
+
+// The system directories that name no drive are written below drive C, and nowhere else.
+TEST_F(HostedMachineTest, WhatNamesNoDriveIsWrittenIntoTheMachine) {
+    std::size_t ran = 0;
+    for (const char* path : {"/Applications", R"(\Halvorn)", "/Library"}) {
+        EXPECT_EQ(_mkdir(path), 0) << path;
+        EXPECT_TRUE(std::filesystem::is_directory(DriveC("/" + std::string(path + 1)))) << path;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 3u);
+}
+
+TEST_F(HostedMachineTest, ASeparatorBehindANameMeansAFolder) {
+    machine.Has(R"(C:\folder\file)", "x");
+    EXPECT_EQ(Current().HostPath(std::wstring(L"C:\\folder\\")), DriveC("/folder"));
+    EXPECT_EQ(Current().HostPath(std::wstring(L"C:\\folder//")), DriveC("/folder"));
+    EXPECT_EQ(Current().HostPath(std::wstring(L"C:\\folder\\file\\")), Refused());
+    EXPECT_EQ(Current().HostPath(std::wstring(L"C:\\missing\\")), DriveC("/missing/"));
+}
+
+TEST_F(HostedMachineTest, AMalformedNameIsOneNameInBothKindsOfText) {
+    EXPECT_EQ(Current().HostPath(std::string("C:\\a\xFF.txt")), DriveC("/a\xEF\xBF\xBD.txt"));
+    EXPECT_EQ(Current().HostPath(std::string("Z:\\a\xFF")), "/a\xEF\xBF\xBD");
+}
+
+TEST(ProgramArgumentsTest, APathOfTheHostIsOneOnDriveZ) {
+    const char* const words[] = {"program", "dir=/tmp/a b", "log=/x", "/tmp/out.hvpkg", "dir=packages", "--verbose",
+                                 "/?",      "=/x",          "/",      "skip=a/b",       R"(log=C:\x)",  "dir="};
+    const std::vector<std::string> expected = {R"(dir=Z:\tmp\a b)", R"(log=Z:\x)", R"(Z:\tmp\out.hvpkg)",
+                                               "dir=packages",      "--verbose",   "/?",
+                                               R"(=Z:\x)",          "/",           "skip=a/b",
+                                               R"(log=C:\x)",       "dir="};
+    EXPECT_EQ(platform::ProgramArguments(static_cast<int>(std::size(words)), words), expected);
+    EXPECT_TRUE(platform::ProgramArguments(0, words).empty());
 }
 
 TEST_F(HostedMachineTest, NamesEveryHostPathInWindowsTerms) {
@@ -288,6 +367,37 @@ TEST_F(HostedRegistryTest, MergesAFixture) {
     EXPECT_EQ(Registry().Text(), expected);
     Registry().Reload();
     EXPECT_EQ(Registry().Text(), expected);
+}
+
+TEST_F(HostedRegistryTest, AreInOrderOfTheirUpperCaseOutsideAsciiToo) {
+    for (const char* name : {"\xC3\xBC", "z", "\xC3\x96", "\xC3\xA4", "_", "\xC4\xB1", "A"}) {
+        Set("SOFTWARE\\Halvorn", name, "x");
+    }
+    std::vector<std::size_t> places;
+    const std::string text = Registry().Text();
+    for (const char* name :
+         {"\"A\"", "\"z\"", "\"_\"", "\"\xC3\xA4\"", "\"\xC3\x96\"", "\"\xC3\xBC\"", "\"\xC4\xB1\""}) {
+        places.push_back(text.find(name));
+    }
+    EXPECT_TRUE(std::is_sorted(places.begin(), places.end())) << text;
+    EXPECT_NE(places.back(), std::string::npos);
+}
+
+// Windows takes 255 characters of UTF-16 in the name of a key. Wine takes more of those outside ASCII, so that it is
+// not asked.
+TEST_F(HostedRegistryTest, RefusesANameOfMoreThan255Characters) {
+    const auto create = [](const char* letter, int count) {
+        std::string name;
+        for (int at = 0; at < count; ++at) {
+            name += letter;
+        }
+        HKEY made = nullptr;
+        return RegCreateKeyExA(HKEY_CURRENT_USER, name.c_str(), 0, nullptr, 0, KEY_ALL_ACCESS, nullptr, &made, nullptr);
+    };
+    EXPECT_EQ(create("\xC3\xBC", 255), ERROR_SUCCESS);
+    EXPECT_EQ(create("\xC3\xBC", 256), ERROR_INVALID_PARAMETER);
+    EXPECT_EQ(create("\xF0\x9F\x8E\xAC", 127), ERROR_SUCCESS);
+    EXPECT_EQ(create("\xF0\x9F\x8E\xAC", 128), ERROR_INVALID_PARAMETER);
 }
 
 TEST_F(HostedRegistryTest, RefusesNamesThatTextCannotHold) {

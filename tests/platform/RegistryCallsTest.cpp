@@ -103,6 +103,17 @@ TEST_F(RegistryCalls, KeysAreFoundInAnyCase) {
     EXPECT_EQ(Open(HKEY_CURRENT_USER, R"(SOFTWARE\halvorn\TEST\mixedcase)"), ERROR_SUCCESS);
 }
 
+TEST_F(RegistryCalls, LettersOutsideAsciiAreFoundInAnyCase) {
+    Make(key, "\xC3\xBC\xCE\xB1\xD1\x8F");
+    EXPECT_EQ(Open(key, "\xC3\x9C\xCE\x91\xD0\xAF"), ERROR_SUCCESS);
+    ASSERT_EQ(Set("\xC3\xA4", REG_SZ, std::string("x\0", 2)), ERROR_SUCCESS);
+    ASSERT_EQ(Set("\xC3\x84", REG_SZ, std::string("y\0", 2)), ERROR_SUCCESS);
+    EXPECT_EQ(Get("\xC3\xA4").data, std::string("y\0", 2));
+    // A letter without a dot is another letter.
+    Make(key, "\xC4\xB1");
+    EXPECT_EQ(Open(key, "I"), ERROR_FILE_NOT_FOUND);
+}
+
 TEST_F(RegistryCalls, AnEmptyPathReopensTheKey) {
     EXPECT_EQ(Open(key, ""), ERROR_SUCCESS);
     EXPECT_EQ(Open(key, nullptr), ERROR_SUCCESS);
@@ -320,6 +331,25 @@ TEST_F(RegistryCalls, ALongNameIsRefused) {
     EXPECT_NE(Create(key, std::string(300, 'x').c_str(), made), ERROR_SUCCESS);
     ASSERT_EQ(Create(key, std::string(255, 'x').c_str(), made), ERROR_SUCCESS);
     RegCloseKey(made);
+}
+
+std::string Repeated(const char* text, std::size_t count) {
+    std::string repeated;
+    for (std::size_t at = 0; at < count; ++at) {
+        repeated += text;
+    }
+    return repeated;
+}
+
+TEST_F(RegistryCalls, ALongNameIsCountedInCharactersAndNotInBytes) {
+    HKEY made = nullptr;
+    ASSERT_EQ(Create(key, Repeated("\xC3\xBC", 255).c_str(), made), ERROR_SUCCESS);
+    RegCloseKey(made);
+}
+
+TEST_F(RegistryCalls, ALongNameOfAValueIsRefused) {
+    EXPECT_EQ(Set(std::string(16383, 'x').c_str(), REG_SZ, std::string("y\0", 2)), ERROR_SUCCESS);
+    EXPECT_EQ(Set(std::string(16384, 'x').c_str(), REG_SZ, std::string("y\0", 2)), ERROR_INVALID_PARAMETER);
 }
 
 TEST_F(RegistryCalls, TheFreshMachineHasAListOfInstalledPrograms) {

@@ -134,6 +134,68 @@ TEST_F(RuntimeCalls, OpeningWhatIsMissingSaysSo) {
     EXPECT_EQ(ErrorOfOpening("", "wb"), ENOENT);
 }
 
+TEST_F(RuntimeCalls, ANameThatWindowsRefusesIsAnInvalidArgument) {
+    std::size_t ran = 0;
+    for (const char* name : {"a<b", "a?b", "a\"b"}) {
+        EXPECT_EQ(ErrorOfOpening(In(name), "rb"), EINVAL) << name;
+        EXPECT_EQ(ErrorOfOpening(In(name), "wb"), EINVAL) << name;
+        EXPECT_EQ(_mkdir(In(name).c_str()), -1) << name;
+        EXPECT_EQ(errno, EINVAL) << name;
+        EXPECT_EQ(_unlink(In(name).c_str()), -1) << name;
+        EXPECT_EQ(errno, EINVAL) << name;
+        EXPECT_FALSE(RemoveDirectoryA(In(name).c_str())) << name;
+        EXPECT_EQ(GetLastError(), static_cast<DWORD>(ERROR_INVALID_NAME)) << name;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 3u);
+}
+
+TEST_F(RuntimeCalls, WhatCannotBeThereIsMissing) {
+    EXPECT_EQ(ErrorOfOpening(R"(Q:\x)", "wb"), ENOENT);
+    EXPECT_EQ(ErrorOfOpening(R"(\\server.invalid\share\x)", "wb"), ENOENT);
+}
+
+TEST_F(RuntimeCalls, ASeparatorBehindAFilesNameIsAnInvalidArgument) {
+    machine.Has(In("file"), "x");
+    std::size_t ran = 0;
+    for (const char* name : {"file\\", "file/"}) {
+        EXPECT_EQ(ErrorOfOpening(In(name), "rb"), EINVAL) << name;
+        EXPECT_EQ(ErrorOfOpening(In(name), "wb"), EINVAL) << name;
+        EXPECT_EQ(_unlink(In(name).c_str()), -1) << name;
+        EXPECT_EQ(errno, EINVAL) << name;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 2u);
+    EXPECT_EQ(ErrorOfOpening(In("new\\"), "rb"), ENOENT);
+    EXPECT_EQ(ErrorOfOpening(In("new\\"), "wb"), EINVAL);
+    EXPECT_EQ(machine.Content(In("file")), "x");
+    EXPECT_FALSE(machine.Exists(In("new")));
+    EXPECT_EQ(_mkdir(In("new\\").c_str()), 0);
+}
+
+TEST_F(RuntimeCalls, AnOpenFileIsNotDeleted) {
+    std::size_t ran = 0;
+    for (const char* mode : {"wb", "rb", "r", "ab", "w"}) {
+        FILE* stream = Open(In("file"), mode);
+        ASSERT_NE(stream, nullptr) << mode;
+        EXPECT_EQ(_unlink(In("file").c_str()), -1) << mode;
+        EXPECT_EQ(errno, EACCES) << mode;
+        std::fclose(stream);
+        EXPECT_TRUE(machine.HasFile(In("file"))) << mode;
+        ++ran;
+    }
+    EXPECT_EQ(ran, 5u);
+    EXPECT_EQ(_unlink(In("file").c_str()), 0);
+}
+
+TEST_F(RuntimeCalls, AMalformedNameIsTheSameFileForEveryCall) {
+    const std::string name = In("a\xFF.txt");
+    Write(name, "wb", "x");
+    EXPECT_EQ(machine.Files().count(In("a\xEF\xBF\xBD.txt")), 1u);
+    EXPECT_EQ(Read(name, "rb"), "x");
+    EXPECT_EQ(_unlink(In("a\xEF\xBF\xBD.txt").c_str()), 0);
+}
+
 TEST_F(RuntimeCalls, AFileIsNoFolderOnTheWay) {
     machine.Has(In("file"), "x");
     EXPECT_EQ(ErrorOfOpening(In(R"(file\below)"), "wb"), ENOENT);

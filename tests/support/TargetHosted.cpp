@@ -1,4 +1,4 @@
-#include <fcntl.h>
+#include <sys/mman.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -6,6 +6,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "platform/hosted/failure.h"
 #include "platform/hosted/machine.h"
 #include "tests/support/RunProgram.h"
 #include "tests/support/ScratchFile.h"
@@ -80,12 +81,10 @@ RegistryContent MachineTarget::AddedRegistry() const {
 }
 
 int OpenScratchFile() {
-    char name[] = "/tmp/hv-scratch-XXXXXX";
-    const int descriptor = mkostemp(name, O_CLOEXEC);
+    const int descriptor = memfd_create("scratch", MFD_CLOEXEC);
     if (descriptor < 0) {
         hosted::EndWithMessage(std::string("cannot make a scratch file: ") + std::strerror(errno));
     }
-    unlink(name);
     return descriptor;
 }
 
