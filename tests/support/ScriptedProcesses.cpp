@@ -80,6 +80,7 @@ BOOL GetScriptedTokenInformation(HANDLE token, TOKEN_INFORMATION_CLASS what, LPV
         return FALSE;
     }
     std::copy(user.begin(), user.end(), static_cast<char*>(block));
+    *needed = ProcessOf(token).takesUserBack ? 0 : *needed;
     return TRUE;
 }
 

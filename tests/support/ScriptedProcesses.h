@@ -9,6 +9,7 @@ struct ScriptedProcess {
     std::uint32_t number = 0;
     std::string path = {};
     std::vector<char> user = {};  // the block that tells of the user
+    bool takesUserBack = false;   // the block is written, and then said to be empty
     bool opens = true;
     bool showsModules = true;
     bool showsToken = true;

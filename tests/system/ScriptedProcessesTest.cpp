@@ -143,11 +143,15 @@ TEST(ScriptedProcesses, WithoutATokenHaveTheTagZero) {
     EXPECT_EQ(all[0].ownerTag, 0U);
 }
 
+// What stands in a block counts only as far as the system says that it has filled it.
 TEST(ScriptedProcesses, WithAnEmptyUserHaveTheTagZero) {
-    ProcessScript::Renew().Runs(R"(C:\a.exe)");
+    ProcessScript::Renew().processes = {
+        {.number = 4, .path = R"(C:\a.exe)"},
+        {.number = 8, .path = R"(C:\b.exe)", .user = {1, 2, 3, 4}, .takesUserBack = true}};
     const auto all = Snapshot();
-    ASSERT_EQ(all.size(), 1U);
+    ASSERT_EQ(all.size(), 2U);
     EXPECT_EQ(all[0].ownerTag, 0U);
+    EXPECT_EQ(all[1].ownerTag, 0U);
 }
 
 TEST(ScriptedProcesses, AreForgottenByTheNextSnapshot) {
