@@ -17,6 +17,7 @@ void WinWizardController::Initialize(int showCommand) {
     CheckPackagesAndHosts();
     hasProductChoice = !model.ShownIdentifiers().empty();
     toolkit_.SetContinueText(*window, FirstContinueText());
+    initialized = true;
 }
 
 void WinWizardController::MakeWindow(const std::string& caption, int showCommand) {
@@ -25,8 +26,8 @@ void WinWizardController::MakeWindow(const std::string& caption, int showCommand
     toolkit_.ShowWindow(WizardPart::MainWindow, showCommand);
 }
 
-// These boxes have no owner, so the window behind them takes presses. Who agrees behind the warning finds the button to
-// read "Install", because the choice of products is looked at only afterwards; that order is kept.
+// These boxes have no owner, so the window behind them takes presses. None of these is a command yet: packages that
+// have been refused must not be installed from behind the box that refuses them.
 void WinWizardController::CheckPackagesAndHosts() {
     const InstallerModel& model = InstallerModel::Instance();
     if (!model.valid) {

@@ -32,7 +32,7 @@ public:
     /// reports bad packages and missing hosts. Ends the process where the run cannot go on.
     void Initialize(int showCommand);
 
-    /// Whether a command may run now. Tells the user when no product is chosen.
+    /// Whether a command may run now: none before Initialize() has returned. Tells the user when no product is chosen.
     [[nodiscard]] bool CanPerform(int commandId);
 
     /// Runs a command that may run now; others do nothing. The identifiers are those of WizardCommand.
@@ -54,6 +54,7 @@ public:
     FinalPage* finalPage = nullptr;
     DeployJob* job = nullptr;  // lives until the process ends: its thread may outlive the controller
     EULAWindowController* eulaController = nullptr;
+    bool initialized = false;  // Initialize() has returned: commands are listened to
 
 private:
     // The way to the first page.

@@ -9,6 +9,9 @@
 namespace HV {
 
 bool WinWizardController::CanPerform(int commandId) {
+    if (!initialized) {
+        return false;
+    }
     switch (commandId) {
         case kContinueCommand:
             return CanContinue();

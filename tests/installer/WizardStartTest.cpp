@@ -18,6 +18,7 @@ TEST_F(WizardStart, HasNothingBeforeItIsInitialized) {
     EXPECT_EQ(wizard.finalPage, nullptr);
     EXPECT_EQ(wizard.job, nullptr);
     EXPECT_EQ(wizard.eulaController, nullptr);
+    EXPECT_FALSE(wizard.initialized);
 }
 
 TEST_F(WizardStart, NumbersItsStates) {
@@ -41,6 +42,7 @@ TEST_F(WizardStart, ShowsTheFirstPageInOrder) {
     EXPECT_FALSE(toolkit.CanPress(HV::kBackCommand));
     EXPECT_TRUE(toolkit.CanPress(HV::kCancelCommand));
     EXPECT_EQ(wizard.selectionPage, nullptr);
+    EXPECT_TRUE(wizard.initialized);
 }
 
 TEST_F(WizardStart, OffersTheInstallAtOnceWhenThereIsNothingToChoose) {
@@ -92,6 +94,75 @@ TEST_F(InvalidPackages, EndTheRunBeforeMissingHostsAreLookedAt) {
     Ships(HostProduct("glow", "aftereffects"));
     (void)setup.Has(Product("stranger"));
     ExpectRefusal();
+}
+
+/// The window stands behind the boxes that come at the start, and they do not keep the user from it.
+class BehindTheFirstBox : public WizardTest {
+protected:
+    /// The way to an install first, then every other button.
+    void PressEverything() {
+        const auto before = toolkit.calls;
+        for (const int command : {HV::kAgreeCommand, HV::kContinueCommand, HV::kContinueCommand, HV::kBackCommand,
+                                  HV::kReadLicenseCommand, HV::kWhatsNewCommand, HV::kResourcesCommand,
+                                  HV::kDisagreeCommand, HV::kCancelCommand, HV::kCloseCommand}) {
+            EXPECT_FALSE(wizard.CanPerform(command)) << command;
+            wizard.Perform(command);
+            ++pressed;
+        }
+        EXPECT_EQ(toolkit.calls, before);
+        EXPECT_FALSE(wizard.agreed);
+        EXPECT_EQ(wizard.state, HV::WizardState::Welcome);
+        EXPECT_EQ(wizard.selectionPage, nullptr);
+        EXPECT_EQ(wizard.job, nullptr);
+    }
+
+    void AnswerAfterPressing() {
+        toolkit.AnswerNext(kOk, [this] { PressEverything(); });
+    }
+
+    int pressed = 0;
+};
+
+TEST_F(BehindTheFirstBox, RefusedPackagesCannotBeInstalled) {
+    Ships(Product("glow"));
+    const std::string file = InPackages("com.halvorn.glow.hvpkg");
+    machine.Has(file, machine.Content(file) + "x");
+    const auto before = machine.Files();
+    AnswerAfterPressing();
+    BeginAndEnd();
+    EXPECT_EQ(pressed, 10);
+    EXPECT_EQ(toolkit.boxes, std::vector{kInvalidPackages});
+    EXPECT_TRUE(toolkit.quits.empty());
+    EXPECT_EQ(machine.Files(), before);
+}
+
+TEST_F(BehindTheFirstBox, NothingIsInstalledForHostsThatAreNotThere) {
+    Ships(HostProduct("glow", "aftereffects"));
+    Ships(Hidden("core"));
+    const auto before = machine.Files();
+    AnswerAfterPressing();
+    BeginAndEnd();
+    EXPECT_EQ(pressed, 10);
+    EXPECT_EQ(toolkit.boxes, std::vector{kNoHosts});
+    EXPECT_TRUE(toolkit.quits.empty());
+    EXPECT_EQ(machine.Files(), before);
+}
+
+TEST_F(BehindTheFirstBox, NobodyAgreesBeforeTheWarningIsRead) {
+    Ships(HostProduct("glow", "aftereffects"));
+    Ships(Product("titler"));
+    AnswerAfterPressing();
+    Begin();
+    EXPECT_EQ(pressed, 10);
+    EXPECT_EQ(toolkit.boxes, std::vector{kMissingHosts});
+    EXPECT_TRUE(toolkit.quits.empty());
+    // The wizard begins where it would have begun.
+    EXPECT_EQ(toolkit.VisiblePages(), std::vector{WizardPart::WelcomePage});
+    EXPECT_EQ(toolkit.Window().continueText, "Continue");
+    EXPECT_FALSE(toolkit.CanPress(HV::kContinueCommand));
+    toolkit.Press(HV::kAgreeCommand);
+    toolkit.Press(HV::kContinueCommand);
+    EXPECT_EQ(toolkit.VisiblePages(), std::vector{WizardPart::SelectionPage});
 }
 
 class Hosts : public WizardTest {};

@@ -160,6 +160,8 @@ bool RunningWizard::HasWindow() {
 
 HWND RunningWizard::Window() {
     EXPECT_TRUE(Eventually([this] { return HasWindow(); })) << "the main window does not come";
+    // It shows itself a little before it listens.
+    EXPECT_EQ(WaitForInputIdle(process_.hProcess, kMinute), 0U);
     return window_;
 }
 
@@ -237,6 +239,23 @@ void RunningWizard::PressBoth(HWND parent, int first, int second) {
     // Posted messages come before timers.
     PostMessageA(GetDlgItem(parent, first), BM_CLICK, 0, 0);
     PostMessageA(GetDlgItem(parent, second), BM_CLICK, 0, 0);
+}
+
+void RunningWizard::ClickQuickly(HWND parent, int id, int times) {
+    const HWND control = GetDlgItem(parent, id);
+    constexpr LPARAM kInside = MAKELPARAM(5, 5);
+    for (int click = 0; click < times; ++click) {
+        PostMessageA(control, click % 2 == 0 ? WM_LBUTTONDOWN : WM_LBUTTONDBLCLK, MK_LBUTTON, kInside);
+        PostMessageA(control, WM_LBUTTONUP, 0, kInside);
+    }
+}
+
+void RunningWizard::Command(HWND parent, int id) {
+    DWORD_PTR result = 0;
+    EXPECT_NE(SendMessageTimeoutA(parent, WM_COMMAND, MAKEWPARAM(id, BN_CLICKED),
+                                  reinterpret_cast<LPARAM>(GetDlgItem(parent, id)), SMTO_NORMAL, kMinute, &result),
+              0)
+        << "the command " << id << " does not come to an end";
 }
 
 void RunningWizard::CloseFromTitleBar(HWND window) {

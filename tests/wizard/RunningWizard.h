@@ -47,7 +47,7 @@ public:
     RunningWizard(const RunningWizard&) = delete;
     RunningWizard& operator=(const RunningWizard&) = delete;
 
-    /// The main window, once it is to be seen. It is the one with the buttons.
+    /// The main window, once it is to be seen and listens. It is the one with the buttons.
     HWND Window();
     /// Whether it is to be seen already.
     [[nodiscard]] bool HasWindow();
@@ -70,6 +70,11 @@ public:
     void PressForBox(HWND parent, int id);
     /// Two presses, one straight after the other, before the program has time for anything else.
     void PressBoth(HWND parent, int first, int second);
+    /// Clicks with the mouse, so many times within the time of a double click. Over before the program has dealt with
+    /// it.
+    static void ClickQuickly(HWND parent, int id, int times);
+    /// Gives a command as its control would, whether or not that can be pressed.
+    static void Command(HWND parent, int id);
     /// The close box of a window's title bar.
     static void CloseFromTitleBar(HWND window);
 

@@ -113,7 +113,7 @@ bool Exists(const std::string& path) {
 
 void Welcome(RunningWizard& wizard) {
     ASSERT_NE(PageThatComesWith(wizard, id::Agree), nullptr);
-    // What is to be said of packages and hosts comes right behind the window, which would take presses all the same.
+    // What is to be said of packages and hosts comes right after the window, which listens to nobody before that.
     const ULONGLONG shown = GetTickCount64();
     ASSERT_TRUE(Comes(wizard, [=] { return GetTickCount64() - shown > 1000; }));
     SetForegroundWindow(wizard.Window());

@@ -51,6 +51,8 @@ HFONT FontOf(HWND window);
 /// Has what a test of windows needs. The windows of a test are gone when it ends, and so is what they posted.
 class WindowTest : public testing::Test {
 protected:
+    /// The controller listens to commands, as it does once a wizard has come up: these tests make windows one by one.
+    WindowTest() { controller.initialized = true; }
     ~WindowTest() override;
 
     /// A window for controls and pages, of 700 by 500, which is visible.
