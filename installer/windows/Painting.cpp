@@ -52,8 +52,7 @@ void FillClient(HWND window, HDC device, HBRUSH brush) {
 }
 
 bool IsPress(WPARAM command) {
-    const unsigned code = HIWORD(command);
-    return code == BN_CLICKED || code == BN_DOUBLECLICKED;
+    return HIWORD(command) == BN_CLICKED;
 }
 
 }  // namespace HV

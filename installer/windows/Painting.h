@@ -40,8 +40,8 @@ void DrawBitmap(HDC device, HBITMAP bitmap, int left, int top);
 /// Fills the client area of a window.
 void FillClient(HWND window, HDC device, HBRUSH brush);
 
-/// Whether a WM_COMMAND means that a control was pressed. A second press within the time of a double click arrives
-/// under a code of its own; without it quick presses would be lost.
+/// Whether a WM_COMMAND means that a push button was pressed. The second click of a double click arrives under a code
+/// of its own and is no press: by then the button may mean something else, as Continue does that has become Install.
 [[nodiscard]] bool IsPress(WPARAM command);
 
 }  // namespace HV

@@ -28,6 +28,13 @@ std::wstring ControlName(const std::string& displayName) {
     return name;
 }
 
+// A check box means the same at each click, so the second one of a double click counts: no quick click is lost.
+bool IsToggle(WPARAM command) {
+    const int identifier = LOWORD(command);
+    return identifier >= kFirstCheckControl && identifier <= kLastCheckControl &&
+           (IsPress(command) || HIWORD(command) == BN_DOUBLECLICKED);
+}
+
 void SendCheck(HWND control, bool checked) {
     ::SendMessageW(control, BM_SETCHECK, checked ? BST_CHECKED : BST_UNCHECKED, 0);
 }
@@ -139,13 +146,10 @@ bool SelectionPage::OnDrawItem(const DRAWITEMSTRUCT& item) const {
 
 void SelectionPage::OnCommand(WPARAM command) {
     const int identifier = LOWORD(command);
-    if (!IsPress(command)) {
-        return;
-    }
-    if (identifier == kDeselectAllControl || identifier == kSelectAllControl) {
-        CheckAll(identifier == kSelectAllControl);
-    } else if (identifier >= kFirstCheckControl && identifier <= kLastCheckControl) {
+    if (IsToggle(command)) {
         Toggle(identifier);
+    } else if (IsPress(command) && (identifier == kDeselectAllControl || identifier == kSelectAllControl)) {
+        CheckAll(identifier == kSelectAllControl);
     }
 }
 

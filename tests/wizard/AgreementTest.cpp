@@ -97,6 +97,17 @@ TEST_F(AgreementTest, OpensAnotherViewerEachTimeAndTheWizardGoesOn) {
     EXPECT_NE(Open(wizard), nullptr);
 }
 
+TEST_F(AgreementTest, OpensOneViewerForADoubleClick) {
+    HasEveryHost();
+    RunningWizard wizard(folder);
+    const HWND page = wizard.PageWith(id::ReadLicense);
+    RunningWizard::ClickQuickly(page, id::ReadLicense, 2);
+    // Dealt with after it.
+    RunningWizard::ClickQuickly(page, id::Agree, 1);
+    EXPECT_TRUE(Eventually([&] { return IsWindowEnabled(GetDlgItem(page, id::Agree)) == FALSE; }));
+    EXPECT_EQ(wizard.Viewers().size(), 1U);
+}
+
 TEST_F(AgreementTest, SavesTheBytesOfTheDocument) {
     HasEveryHost();
     RunningWizard wizard(folder);

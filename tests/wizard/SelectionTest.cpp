@@ -67,6 +67,37 @@ TEST_F(SelectionTest, ChecksAndUnchecksOneByOneAndAllTogether) {
     EXPECT_TRUE(wizard.Shows(page, Boxes(All(true), All(true))));
 }
 
+TEST_F(SelectionTest, TogglesABoxAtEachOfManyQuickClicks) {
+    HasEveryHost();
+    RunningWizard wizard(folder);
+    GoToSelection(wizard);
+    const HWND page = wizard.Page();
+    RunningWizard::ClickQuickly(page, ProductId(1), 2);
+    RunningWizard::ClickQuickly(page, ProductId(2), 3);
+    RunningWizard::ClickQuickly(page, ProductId(3), 4);
+    RunningWizard::ClickQuickly(page, ProductId(4), 5);
+    std::vector<bool> checked = All(true);
+    checked[2] = checked[4] = false;
+    EXPECT_TRUE(wizard.Shows(page, Boxes(checked, All(true))));
+}
+
+TEST_F(SelectionTest, ComesByADoubleClickOnContinueAndStays) {
+    HasEveryHost();
+    RunningWizard wizard(folder);
+    const HWND welcome = wizard.PageWith(id::Agree);
+    const HWND window = wizard.Window();
+    wizard.Press(welcome, id::Agree);
+    RunningWizard::ClickQuickly(window, id::Continue, 2);
+    // What comes after it has been dealt with shows that it has been, too.
+    RunningWizard::ClickQuickly(welcome, id::ReadLicense, 1);
+    EXPECT_TRUE(Eventually([&] { return wizard.Viewers().size() == 1; }));
+    EXPECT_EQ(TextOf(GetDlgItem(window, id::Continue)), "Install");
+    EXPECT_TRUE(IsWindowEnabled(GetDlgItem(window, id::Continue)));
+    EXPECT_NE(GetDlgItem(wizard.Page(), id::DeselectAll), nullptr) << "it is not the selection page";
+    EXPECT_FALSE(wizard.HasBox());
+    EXPECT_FALSE(IsRegistered());
+}
+
 TEST_F(SelectionTest, KeepsTheChoiceThroughATripToTheFirstPage) {
     HasEveryHost();
     RunningWizard wizard(folder);

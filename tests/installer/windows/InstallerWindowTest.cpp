@@ -124,9 +124,8 @@ TEST_F(InstallerWindowTest, FillsThePageAndTheStrip) {
 TEST_F(InstallerWindowTest, HandsItsButtonsToTheController) {
     Make();
     Press(*window, HV::kCancelCommand);
-    Press(*window, HV::kCancelCommand, BN_DOUBLECLICKED);
     Press(*window, HV::kCloseCommand);
-    EXPECT_EQ(toolkit.quits, (std::vector<int>{0, 0, 0}));
+    EXPECT_EQ(toolkit.quits, (std::vector<int>{0, 0}));
 }
 
 TEST_F(InstallerWindowTest, HandsOverNothingElse) {
@@ -135,6 +134,7 @@ TEST_F(InstallerWindowTest, HandsOverNothingElse) {
     Press(*window, IDCANCEL);
     Press(*window, IDOK);
     Press(*window, HV::kCancelCommand, BN_SETFOCUS);
+    Press(*window, HV::kCancelCommand, BN_DOUBLECLICKED);
     EXPECT_EQ(toolkit.quits, std::vector<int>{});
 }
 

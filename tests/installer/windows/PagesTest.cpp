@@ -82,12 +82,11 @@ TEST_F(WelcomePageTest, FillsItsBackground) {
 TEST_F(WelcomePageTest, HandsAPressToTheController) {
     Press(page, HV::kDisagreeCommand);
     EXPECT_EQ(toolkit.quits, std::vector<int>{0});
-    Press(page, HV::kDisagreeCommand, BN_DOUBLECLICKED);
-    EXPECT_EQ(toolkit.quits, (std::vector<int>{0, 0}));
 }
 
 TEST_F(WelcomePageTest, HandsOverNothingElse) {
     Press(page, HV::kDisagreeCommand, BN_SETFOCUS);
+    Press(page, HV::kDisagreeCommand, BN_DOUBLECLICKED);
     Press(page, HV::kCancelCommand);
     EXPECT_EQ(toolkit.quits, std::vector<int>{});
 }

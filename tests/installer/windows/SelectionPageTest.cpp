@@ -137,11 +137,20 @@ TEST_F(SelectionPageTest, PaintsBoxesAtOnceWhenAllAreChanged) {
     EXPECT_FALSE(NeedsPainting(kFirstBox));
 }
 
-TEST_F(SelectionPageTest, TakesASecondQuickPressForAPress) {
+TEST_F(SelectionPageTest, TogglesABoxAtTheSecondQuickClickToo) {
     MakeWithADisabledOne();
     Press(page, kFirstBox);
     Press(page, kFirstBox, BN_DOUBLECLICKED);
     EXPECT_EQ(page.UncheckedIdentifiers(), Names{"keyer"});
+}
+
+TEST_F(SelectionPageTest, TakesTheSecondQuickClickOnAButtonForNoPress) {
+    MakeWithADisabledOne();
+    Press(page, kDeselectAll, BN_DOUBLECLICKED);
+    EXPECT_EQ(page.CheckedCount(), 2);
+    Press(page, kDeselectAll);
+    Press(page, kSelectAll, BN_DOUBLECLICKED);
+    EXPECT_EQ(page.CheckedCount(), 0);
 }
 
 TEST_F(SelectionPageTest, DoesNothingWhenABoxOnlyGetsTheFocus) {
