@@ -13,6 +13,8 @@ constexpr int kRowHeight = 22;
 constexpr int kLeftMargin = 10;
 constexpr int kRightMargin = 30;
 constexpr int kLargestCorner = 4;
+constexpr int kViewerButtonBottom = 590;
+constexpr int kViewerButtonHeight = 25;
 
 }  // namespace
 
@@ -26,6 +28,22 @@ Growth Grow(Columns window, int width) {
         step.columns.right -= over / 2;
     }
     return step;
+}
+
+Columns KeptOnScreen(Columns window, Columns screen) {
+    const int width = window.right - window.left;
+    const int left = std::min(std::max(window.left, screen.left), screen.right - width);
+    return {left, left + width};
+}
+
+ViewerPlaces PlacesInViewer(int width, int height) {
+    const int right = width - kViewerWidth;
+    const int down = height - kViewerHeight;
+    const int top = kViewerButtonBottom - kViewerButtonHeight + down;
+    const int bottom = kViewerButtonBottom + down;
+    return {{350 + right, top, 430 + right, bottom},
+            {440 + right, top, 520 + right, bottom},
+            {30, 50, std::max(510 + right, 30), std::max(545 + down, 50)}};
 }
 
 int FillWidth(int percent, int barWidth) {

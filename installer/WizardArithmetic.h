@@ -26,6 +26,25 @@ struct Growth {
 /// Widens a window by 25 columns on each side. A step that reaches or passes `width` ends at exactly that width.
 [[nodiscard]] Growth Grow(Columns window, int width);
 
+/// The same stretch where the window stays in sight: moved, if it must be, into the columns of the screen. Where it
+/// does not fit, its right end is in sight.
+[[nodiscard]] Columns KeptOnScreen(Columns window, Columns screen);
+
+/// The outer size of the agreement viewer where the screen has room for it.
+constexpr int kViewerWidth = 560;
+constexpr int kViewerHeight = 640;
+
+/// Where things stand in the agreement viewer.
+struct ViewerPlaces {
+    Place closeButton;
+    Place saveButton;
+    Place text;
+};
+
+/// Their places in a viewer of this outer size. In one that has been cut to its screen the buttons stand as far from
+/// the right and lower edges as in a whole one, and the text has the room that is left.
+[[nodiscard]] ViewerPlaces PlacesInViewer(int width, int height);
+
 /// How many columns of a bar `percent` fills. Below 0 is as 0, above 100 is as 100; parts of a column do not count.
 [[nodiscard]] int FillWidth(int percent, int barWidth);
 

@@ -1,5 +1,8 @@
 #include "installer/windows/EULAWindow.h"
 
+#include <algorithm>
+
+#include "installer/WizardArithmetic.h"
 #include "installer/windows/EULAWindowController.h"
 #include "installer/windows/Painting.h"
 #include "installer/windows/WizardMetrics.h"
@@ -11,14 +14,28 @@ namespace {
 constexpr int kIcon = 129;
 constexpr int kAgreement = 137;
 constexpr DWORD kStyle = 0x00C80000;  // caption and system menu: no resizing
-constexpr RECT kWindowRect{0, 0, 560, 640};
+constexpr RECT kWindowRect{0, 0, kViewerWidth, kViewerHeight};
 constexpr int kCloseControl = 161;
 constexpr int kSaveControl = 1184;
-constexpr LONG kButtonBottom = 590;
-constexpr LONG kButtonTop = kButtonBottom - WizardMetrics::ButtonHeight;
 constexpr DWORD kRichTextStyle = 0x50A10844;
-constexpr RECT kRichTextRect{30, 50, 510, 545};
 constexpr LONG kInset = 10;
+
+// The window where the screen has room for it; else as much as there is room for, so that its buttons can be reached.
+RECT CutToScreen(const RECT& window) {
+    const RECT area = ATL::WorkAreaAt(window);
+    return {window.left, window.top, window.left + std::min(window.right - window.left, area.right - area.left),
+            window.top + std::min(window.bottom - window.top, area.bottom - area.top)};
+}
+
+RECT RectOf(const Place& place) {
+    return {place.left, place.top, place.right, place.bottom};
+}
+
+ViewerPlaces PlacesIn(HWND viewer) {
+    RECT frame{};
+    ::GetWindowRect(viewer, &frame);
+    return PlacesInViewer(static_cast<int>(frame.right - frame.left), static_cast<int>(frame.bottom - frame.top));
+}
 
 }  // namespace
 
@@ -42,7 +59,7 @@ ATL::CWndClassInfo& EULAWindow::GetWndClassInfo() {
 }
 
 bool EULAWindow::CreateCentered() {
-    if (Create(nullptr, kWindowRect, "Halvorn Software License", kStyle) == nullptr) {
+    if (Create(nullptr, CutToScreen(kWindowRect), "Halvorn Software License", kStyle) == nullptr) {
         return false;
     }
     CenterWindow();
@@ -84,12 +101,14 @@ void EULAWindow::OnFinalMessage(HWND) {
 }
 
 void EULAWindow::OnCreate() {
-    MakeButton(closeButton_, m_hWnd, "Close", kCloseControl, {350, kButtonTop, 430, kButtonBottom});
+    const ViewerPlaces places = PlacesIn(m_hWnd);
+    MakeButton(closeButton_, m_hWnd, "Close", kCloseControl, RectOf(places.closeButton));
     saveButton_.highlighted = true;
-    MakeButton(saveButton_, m_hWnd, "Save License", kSaveControl, {440, kButtonTop, 520, kButtonBottom});
-    richText_ = ::CreateWindowExW(0, L"RICHEDIT50W", L"License", kRichTextStyle, kRichTextRect.left, kRichTextRect.top,
-                                  kRichTextRect.right - kRichTextRect.left, kRichTextRect.bottom - kRichTextRect.top,
-                                  m_hWnd, nullptr, ::GetModuleHandleW(nullptr), nullptr);
+    MakeButton(saveButton_, m_hWnd, "Save License", kSaveControl, RectOf(places.saveButton));
+    const Place& text = places.text;
+    richText_ =
+        ::CreateWindowExW(0, L"RICHEDIT50W", L"License", kRichTextStyle, text.left, text.top, text.right - text.left,
+                          text.bottom - text.top, m_hWnd, nullptr, ::GetModuleHandleW(nullptr), nullptr);
     agreementText_ = LoadAgreementText();
     InsetText();
     ShowText();

@@ -17,7 +17,8 @@ public:
     /// `controller` is not owned and must outlive the window. Its text is the one that this program carries.
     explicit EULAWindow(EULAWindowController& controller);
 
-    /// Makes the window, hidden and centred on its monitor. Returns whether it is there.
+    /// Makes the window, hidden and centred on its monitor, no larger than that has room for. Returns whether it is
+    /// there.
     [[nodiscard]] bool CreateCentered();
 
     BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;

@@ -172,8 +172,10 @@ void InstallerWindow::GrowStep() {
     if (step.finished) {
         ::KillTimer(m_hWnd, kGrowTimer);
     }
-    ::MoveWindow(m_hWnd, step.columns.left, frame.top, step.columns.right - step.columns.left, frame.bottom - frame.top,
-                 TRUE);
+    // The Close button comes into view at the right: a window that the user has moved to the side grows inwards.
+    const RECT area = ATL::WorkAreaAt(frame);
+    const Columns columns = KeptOnScreen(step.columns, {static_cast<int>(area.left), static_cast<int>(area.right)});
+    ::MoveWindow(m_hWnd, columns.left, frame.top, columns.right - columns.left, frame.bottom - frame.top, TRUE);
 }
 
 }  // namespace HV

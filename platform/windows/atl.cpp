@@ -20,14 +20,14 @@ void EndLoopWith(std::exception_ptr error) noexcept {
     ::PostQuitMessage(0);
 }
 
-RECT WorkAreaAround(HWND window) {
+}  // namespace
+
+RECT WorkAreaAt(const RECT& place) {
     MONITORINFO monitor{};
     monitor.cbSize = sizeof monitor;
-    ::GetMonitorInfoW(::MonitorFromWindow(window, MONITOR_DEFAULTTONEAREST), &monitor);
+    ::GetMonitorInfoW(::MonitorFromRect(&place, MONITOR_DEFAULTTONEAREST), &monitor);
     return monitor.rcWork;
 }
-
-}  // namespace
 
 void RethrowUncaught() {
     if (uncaught) {
@@ -43,9 +43,9 @@ RECT CWindow::GetClientRect() const {
 
 void CWindow::CenterWindow() const {
     const bool child = (::GetWindowLongW(m_hWnd, GWL_STYLE) & WS_CHILD) != 0;
-    const RECT area = child ? CWindow(::GetParent(m_hWnd)).GetClientRect() : WorkAreaAround(m_hWnd);
     RECT own{};
     ::GetWindowRect(m_hWnd, &own);
+    const RECT area = child ? CWindow(::GetParent(m_hWnd)).GetClientRect() : WorkAreaAt(own);
     const long left = area.left + ((area.right - area.left) - (own.right - own.left)) / 2;
     const long top = area.top + ((area.bottom - area.top) - (own.bottom - own.top)) / 2;
     ::SetWindowPos(m_hWnd, nullptr, left, top, 0, 0, SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE);

@@ -17,6 +17,9 @@ class CMessageLoop;
 /// the window carries, so no code is generated at run time. All of it belongs to the thread that makes the windows.
 namespace ATL {
 
+/// The part that windows may cover of the monitor that `place` is on or, if it is on none, nearest to.
+[[nodiscard]] RECT WorkAreaAt(const RECT& place);
+
 /// A window's handle with the operations that the wizard needs. Owns nothing; copies name the same window.
 class CWindow {
 public:

@@ -133,4 +133,56 @@ TEST(CornerDiameter, IsTheSmallerSideOfATinyRectangle) {
     EXPECT_EQ(HV::CornerDiameter(0, 9), 0);
 }
 
+TEST(KeptOnScreen, LeavesAWindowThatIsInSight) {
+    const Columns kept = HV::KeptOnScreen({112, 912}, {0, 1024});
+    EXPECT_EQ(kept.left, 112);
+    EXPECT_EQ(kept.right, 912);
+}
+
+TEST(KeptOnScreen, MovesAWindowInFromBothSides) {
+    EXPECT_EQ(HV::KeptOnScreen({-60, 590}, {0, 1024}).left, 0);
+    EXPECT_EQ(HV::KeptOnScreen({-60, 590}, {0, 1024}).right, 650);
+    EXPECT_EQ(HV::KeptOnScreen({500, 1150}, {100, 1024}).left, 374);
+    EXPECT_EQ(HV::KeptOnScreen({500, 1150}, {100, 1024}).right, 1024);
+}
+
+TEST(KeptOnScreen, KeepsTheRightEndOfAWindowThatDoesNotFit) {
+    const Columns kept = HV::KeptOnScreen({0, 800}, {0, 640});
+    EXPECT_EQ(kept.left, -160);
+    EXPECT_EQ(kept.right, 640);
+}
+
+void ExpectPlace(const Place& place, const Place& expected) {
+    EXPECT_EQ(place.left, expected.left);
+    EXPECT_EQ(place.top, expected.top);
+    EXPECT_EQ(place.right, expected.right);
+    EXPECT_EQ(place.bottom, expected.bottom);
+}
+
+TEST(PlacesInViewer, AreThoseOfTheDesignInAWholeViewer) {
+    const HV::ViewerPlaces places = HV::PlacesInViewer(560, 640);
+    ExpectPlace(places.closeButton, {350, 565, 430, 590});
+    ExpectPlace(places.saveButton, {440, 565, 520, 590});
+    ExpectPlace(places.text, {30, 50, 510, 545});
+}
+
+TEST(PlacesInViewer, KeepTheButtonsAtTheLowerEdgeOfALowViewer) {
+    const HV::ViewerPlaces places = HV::PlacesInViewer(560, 576);
+    ExpectPlace(places.closeButton, {350, 501, 430, 526});
+    ExpectPlace(places.saveButton, {440, 501, 520, 526});
+    ExpectPlace(places.text, {30, 50, 510, 481});
+}
+
+TEST(PlacesInViewer, KeepTheButtonsAtTheRightEdgeOfANarrowViewer) {
+    const HV::ViewerPlaces places = HV::PlacesInViewer(480, 640);
+    ExpectPlace(places.closeButton, {270, 565, 350, 590});
+    ExpectPlace(places.saveButton, {360, 565, 440, 590});
+    ExpectPlace(places.text, {30, 50, 430, 545});
+}
+
+TEST(PlacesInViewer, NeverTurnTheTextInsideOut) {
+    const HV::ViewerPlaces places = HV::PlacesInViewer(40, 80);
+    ExpectPlace(places.text, {30, 50, 30, 50});
+}
+
 }  // namespace
