@@ -73,8 +73,9 @@ const wchar_t* CWndClassInfo::Register(WNDPROC firstProcedure) {
     // NOLINTNEXTLINE(performance-no-int-to-ptr): a colour of the system stands for a brush as its number plus one.
     windowClass.hbrBackground = reinterpret_cast<HBRUSH>(static_cast<std::uintptr_t>(COLOR_WINDOW + 1));
     windowClass.lpszClassName = name.data();
-    if (smallIcon_ != 0) {
-        windowClass.hIconSm = ::LoadIconW(windowClass.hInstance, MAKEINTRESOURCEW(smallIcon_));
+    if (icon_ != 0) {
+        windowClass.hIcon = ::LoadIconW(windowClass.hInstance, MAKEINTRESOURCEW(icon_));
+        windowClass.hIconSm = windowClass.hIcon;
     }
     if (::RegisterClassExW(&windowClass) == 0) {
         return nullptr;

@@ -45,14 +45,14 @@ public:
 /// A class of windows, registered when the first of them is made, under a name that is made from this object's address.
 class CWndClassInfo {
 public:
-    /// `smallIcon` is the number of a resource, 0 for none.
-    explicit CWndClassInfo(std::uint16_t smallIcon = 0) : smallIcon_(smallIcon) {}
+    /// `icon` is the number of a resource, 0 for none: the title bar's icon, and the one of Alt+Tab and the task bar.
+    explicit CWndClassInfo(std::uint16_t icon = 0) : icon_(icon) {}
 
     /// Registers the class unless that has been done. Gives its name, or null when the system refuses.
     [[nodiscard]] const wchar_t* Register(WNDPROC firstProcedure);
 
 private:
-    std::uint16_t smallIcon_;
+    std::uint16_t icon_;
     std::wstring name_;
 };
 

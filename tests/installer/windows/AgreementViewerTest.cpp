@@ -68,6 +68,7 @@ TEST_F(AgreementViewerTest, IsAWindowOfItsOwn) {
     EXPECT_EQ(static_cast<DWORD>(::GetWindowLongW(viewer, GWL_STYLE)) & ~WS_CLIPSIBLINGS, 0x10C80000U);
     EXPECT_EQ(::GetWindow(viewer, GW_OWNER), nullptr);
     EXPECT_NE(::GetClassLongPtrW(viewer, GCLP_HICONSM), 0U);
+    EXPECT_NE(::GetClassLongPtrW(viewer, GCLP_HICON), 0U);
     std::wstring caption(64, L'\0');
     caption.resize(static_cast<std::size_t>(::GetWindowTextW(viewer, caption.data(), 64)));
     EXPECT_EQ(caption, L"Halvorn Software License");

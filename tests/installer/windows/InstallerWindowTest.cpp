@@ -53,8 +53,9 @@ TEST_F(InstallerWindowTest, IsHiddenAndCentredAtFirst) {
     EXPECT_EQ(Frame().top - area.top, (area.bottom - area.top - 430) / 2);
 }
 
-TEST_F(InstallerWindowTest, HasASmallIcon) {
+TEST_F(InstallerWindowTest, HasASmallIconAndABigOne) {
     EXPECT_NE(::GetClassLongPtrW(Make(), GCLP_HICONSM), 0U);
+    EXPECT_NE(::GetClassLongPtrW(*window, GCLP_HICON), 0U);
 }
 
 TEST_F(InstallerWindowTest, HasThreeButtonsAlongTheBottom) {
