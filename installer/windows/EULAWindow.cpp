@@ -80,6 +80,8 @@ BOOL EULAWindow::ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, 
             const PaintDevice nothing(window);
             return TRUE;
         }
+        case WM_ACTIVATE:
+            return focus_.OnActivate(window, wParam) ? TRUE : FALSE;
         case WM_CLOSE:
             ::DestroyWindow(window);
             return TRUE;
@@ -112,6 +114,8 @@ void EULAWindow::OnCreate() {
     agreementText_ = LoadAgreementText();
     InsetText();
     ShowText();
+    // There is one thing to do at first, and the keys are to do it: to read.
+    focus_.Remember(richText_);
 }
 
 void EULAWindow::InsetText() const {

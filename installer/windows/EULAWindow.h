@@ -3,6 +3,7 @@
 #include <string>
 
 #include "installer/windows/CustomButton.h"
+#include "installer/windows/FocusMemory.h"
 #include "platform/windows/atl.h"
 
 namespace HV {
@@ -38,6 +39,7 @@ private:
     CustomButton closeButton_;
     CustomButton saveButton_;
     HWND richText_ = nullptr;
+    FocusMemory focus_;
     EULAWindowController& controller_;
     std::string agreementText_;  // as the program carries it
 };

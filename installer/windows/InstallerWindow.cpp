@@ -48,6 +48,8 @@ BOOL InstallerWindow::ProcessWindowMessage(HWND, UINT message, WPARAM wParam, LP
         case WM_CREATE:
             CreateButtons();
             return TRUE;
+        case WM_ACTIVATE:
+            return focus_.OnActivate(m_hWnd, wParam) ? TRUE : FALSE;
         case WM_CLOSE:
             // Ends the run without raising the engine's cancel, even during an install. The Cancel button raises it;
             // the difference is intended.

@@ -4,6 +4,7 @@
 #include <string>
 
 #include "installer/windows/CustomButton.h"
+#include "installer/windows/FocusMemory.h"
 #include "platform/windows/atl.h"
 
 namespace HV {
@@ -57,6 +58,7 @@ private:
     WinWizardController& controller_;
     std::unique_ptr<WindowCustomButtonOwner> buttonOwner_;
     std::string title_;
+    FocusMemory focus_;
 };
 
 }  // namespace HV

@@ -34,6 +34,8 @@ void Require(bool made) {
 template <class Page>
 Page* PutInto(const InstallerWindow& window, std::unique_ptr<Page> page, const RECT& place) {
     Require(page->Create(window, place, "", kPageStyle, kPageExtendedStyle) != nullptr);
+    // Tab goes through the windows from the top one down: the page first, then the buttons of the bottom strip.
+    ::SetWindowPos(*page, HWND_TOP, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOACTIVATE);
     return page.release();
 }
 

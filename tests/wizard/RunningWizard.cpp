@@ -258,6 +258,26 @@ void RunningWizard::Command(HWND parent, int id) {
         << "the command " << id << " does not come to an end";
 }
 
+HWND RunningWizard::Focus() {
+    GUITHREADINFO info{};
+    info.cbSize = sizeof info;
+    return GetGUIThreadInfo(process_.dwThreadId, &info) ? info.hwndFocus : nullptr;
+}
+
+bool RunningWizard::ComesToFocus(int id) {
+    return Eventually([&] {
+        const HWND focus = Focus();
+        return focus != nullptr && GetDlgCtrlID(focus) == id;
+    });
+}
+
+void RunningWizard::Type(WPARAM key) {
+    const HWND focus = Focus();
+    ASSERT_NE(focus, nullptr) << "nothing of the program has the focus";
+    PostMessageA(focus, WM_KEYDOWN, key, 1);
+    PostMessageA(focus, WM_KEYUP, key, static_cast<LPARAM>(0xC0000001));
+}
+
 void RunningWizard::CloseFromTitleBar(HWND window) {
     PostMessageA(window, WM_SYSCOMMAND, SC_CLOSE, 0);
 }

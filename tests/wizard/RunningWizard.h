@@ -75,6 +75,12 @@ public:
     static void ClickQuickly(HWND parent, int id, int times);
     /// Gives a command as its control would, whether or not that can be pressed.
     static void Command(HWND parent, int id);
+    /// The control that has the focus, or the window itself; null when the program has no focus.
+    [[nodiscard]] HWND Focus();
+    /// The identifier of the control that comes to have the focus; waits until it is this one.
+    [[nodiscard]] bool ComesToFocus(int id);
+    /// A key that goes down and up, at what has the focus now. Over before the program has dealt with it.
+    void Type(WPARAM key);
     /// The close box of a window's title bar.
     static void CloseFromTitleBar(HWND window);
 

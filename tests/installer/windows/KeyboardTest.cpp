@@ -1,9 +1,13 @@
 #include <gtest/gtest.h>
 
+#include <string>
+#include <utility>
 #include <vector>
 
 #include "installer/windows/EULAWindowController.h"
 #include "installer/windows/InstallerWindow.h"
+#include "installer/windows/SelectionPage.h"
+#include "installer/windows/WelcomePage.h"
 #include "platform/windows/wtl.h"
 #include "tests/installer/SetupFolder.h"
 #include "tests/installer/windows/WindowTest.h"
@@ -30,15 +34,18 @@ protected:
         loop.Run();
     }
 
-    // What has the focus after each of so many presses of Tab.
-    std::vector<int> Tab(int times) {
+    static int Focus() { return ::GetDlgCtrlID(::GetFocus()); }
+
+    // What has the focus after each of these keys.
+    std::vector<int> Press(const std::vector<WPARAM>& keys) {
         std::vector<int> reached;
-        for (int press = 0; press < times; ++press) {
-            Type(VK_TAB);
-            reached.push_back(::GetDlgCtrlID(::GetFocus()));
+        for (const WPARAM key : keys) {
+            Type(key);
+            reached.push_back(Focus());
         }
         return reached;
     }
+    std::vector<int> Tab(std::size_t times) { return Press(std::vector<WPARAM>(times, VK_TAB)); }
 
     Machine machine;
     SetupFolder setup{machine};
@@ -59,20 +66,121 @@ protected:
 };
 
 TEST_F(FirstPageKeyboardTest, TabReachesTheButtonsOfThePageToo) {
-    EXPECT_EQ(Tab(5), (std::vector<int>{1126, 1127, 1129, 1128, 1126}));
+    EXPECT_EQ(Tab(5), (std::vector<int>{1127, 1129, 1128, 1126, 1127}));
 }
 
 TEST_F(FirstPageKeyboardTest, SpacePressesAButton) {
-    Tab(4);
+    Tab(3);
     Type(VK_SPACE);
     EXPECT_TRUE(controller.agreed);
 }
 
 TEST_F(FirstPageKeyboardTest, TabGoesOnAfterTheButtonThatDisabledItself) {
-    Tab(4);
+    Tab(3);
     Type(VK_RETURN);
     ASSERT_TRUE(controller.agreed);
-    EXPECT_EQ(Tab(3), (std::vector<int>{1124, 1126, 1127}));
+    EXPECT_EQ(Tab(4), (std::vector<int>{1127, 1124, 1126, 1127}));
+}
+
+TEST_F(FirstPageKeyboardTest, ArrowsGoAlongTheButtonsOfARowAndPressNothing) {
+    ::SetFocus(::GetDlgItem(*window, 1126));
+    Type(VK_RIGHT);
+    EXPECT_EQ(Focus(), 1126) << "what is disabled is passed over";
+    ::SetFocus(controller.welcomePage->readLicenseButton.handle);
+    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_RIGHT, VK_LEFT, VK_UP, VK_UP, VK_DOWN}),
+              (std::vector<int>{1129, 1128, 1128, 1129, 1127, 1127, 1129}));
+    EXPECT_FALSE(controller.agreed);
+    EXPECT_EQ(toolkit.quits, std::vector<int>{});
+}
+
+TEST_F(FirstPageKeyboardTest, ArrowsGoAlongTheBottomStripAsItStandsOnTheScreen) {
+    toolkit.EnableWindow(HV::WizardPart::ContinueButton, true);
+    toolkit.EnableWindow(HV::WizardPart::BackButton, true);
+    ::SetFocus(::GetDlgItem(*window, 1126));
+    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_RIGHT, VK_LEFT, VK_LEFT, VK_LEFT}),
+              (std::vector<int>{1125, 1124, 1124, 1125, 1126, 1126}));
+}
+
+TEST_F(FirstPageKeyboardTest, ArrowsDoNothingWhereNoControlHasTheFocus) {
+    int typed = 0;
+    for (const WPARAM arrow : {VK_LEFT, VK_UP, VK_RIGHT, VK_DOWN}) {
+        ::SetFocus(*window);
+        Type(arrow);
+        EXPECT_EQ(::GetFocus(), window->m_hWnd);
+        ++typed;
+    }
+    EXPECT_EQ(typed, 4);
+}
+
+TEST_F(FirstPageKeyboardTest, TheFocusComesBackWithTheWindow) {
+    const HWND agree = controller.welcomePage->agreeButton.handle;
+    ::SetFocus(agree);
+    ::SetActiveWindow(Parent());
+    ASSERT_NE(::GetFocus(), agree);
+    ::SetActiveWindow(*window);
+    EXPECT_EQ(::GetFocus(), agree);
+}
+
+TEST_F(FirstPageKeyboardTest, TheFocusDoesNotComeBackToWhatCannotBeUsed) {
+    ::SetFocus(controller.welcomePage->agreeButton.handle);
+    ::SetActiveWindow(Parent());
+    toolkit.EnableWindow(HV::WizardPart::AgreeButton, false);
+    ::SetActiveWindow(*window);
+    EXPECT_EQ(::GetFocus(), window->m_hWnd);
+}
+
+TEST_F(FirstPageKeyboardTest, TheFocusStaysOnTheFrameThatHadIt) {
+    ::SetFocus(controller.welcomePage->agreeButton.handle);
+    ::SetFocus(*window);
+    ::SetActiveWindow(Parent());
+    ::SetActiveWindow(*window);
+    EXPECT_EQ(::GetFocus(), window->m_hWnd);
+}
+
+/// The products of a release, in their two columns: 0 to 5 on the left, 6 to 9 on the right.
+class ProductsKeyboardTest : public KeyboardTest {
+protected:
+    ProductsKeyboardTest() {
+        controller.window = toolkit.CreateInstallerWindow(controller, "Installer");
+        std::vector<HV::ProductItem> items;
+        for (int number = 0; number < 10; ++number) {
+            // The third one lacks its hosts.
+            items.push_back({"Product", std::to_string(number), number != 2, number != 2});
+        }
+        page = toolkit.CreateSelectionPage(controller, *controller.window, items);
+        toolkit.ShowWindow(HV::WizardPart::MainWindow, SW_SHOW);
+    }
+
+    void StartAt(int product) const { ::SetFocus(page->CheckButtons().at(static_cast<std::size_t>(product)).handle); }
+
+    HV::SelectionPage* page = nullptr;
+};
+
+TEST_F(ProductsKeyboardTest, DownAndUpGoThroughTheColumns) {
+    StartAt(0);
+    EXPECT_EQ(Press({VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN}),
+              (std::vector<int>{1145, 1147, 1148, 1149, 1150, 1151, 1152, 1153, 1153}));
+    EXPECT_EQ(Press({VK_UP, VK_UP, VK_UP, VK_UP}), (std::vector<int>{1152, 1151, 1150, 1149}));
+}
+
+TEST_F(ProductsKeyboardTest, RightAndLeftGoAlongARow) {
+    StartAt(1);
+    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_LEFT, VK_LEFT}), (std::vector<int>{1151, 1151, 1145, 1145}));
+    StartAt(5);
+    EXPECT_EQ(Press({VK_RIGHT}), std::vector<int>{1149}) << "there is no product on the right of it";
+}
+
+TEST_F(ProductsKeyboardTest, ArrowsChangeNoChoiceAndABlankDoes) {
+    StartAt(0);
+    Press({VK_DOWN, VK_RIGHT});
+    EXPECT_EQ(page->UncheckedIdentifiers(), std::vector<std::string>{"2"});
+    Type(VK_SPACE);
+    EXPECT_EQ(page->UncheckedIdentifiers(), (std::vector<std::string>{"2", "7"}));
+}
+
+TEST_F(ProductsKeyboardTest, ArrowsKeepTheTwoButtonsApartFromTheProducts) {
+    ::SetFocus(::GetDlgItem(*page, 1130));
+    EXPECT_EQ(Press({VK_RIGHT, VK_DOWN, VK_LEFT, VK_UP}), (std::vector<int>{1131, 1131, 1130, 1130}));
 }
 
 TEST_F(FirstPageKeyboardTest, EscapeDoesNothing) {
@@ -82,25 +190,87 @@ TEST_F(FirstPageKeyboardTest, EscapeDoesNothing) {
     EXPECT_NE(::IsWindow(*window), FALSE);
 }
 
-TEST_F(KeyboardTest, TabGoesAroundInTheViewer) {
+/// A viewer of the agreement, as it opens.
+class ViewerKeyboardTest : public KeyboardTest {
+protected:
+    ViewerKeyboardTest() {
+        viewers.ShowAgreement();
+        viewer = ::FindWindowW(nullptr, L"Halvorn Software License");
+        text = ::FindWindowExW(viewer, nullptr, L"RICHEDIT50W", nullptr);
+    }
+
+    // How far the text has been scrolled.
+    [[nodiscard]] LONG HiddenRows() const {
+        POINT hidden{-1, -1};
+        ::SendMessageW(text, EM_GETSCROLLPOS, 0, reinterpret_cast<LPARAM>(&hidden));
+        return hidden.y;
+    }
+    // From and to.
+    [[nodiscard]] std::pair<LONG, LONG> Selection() const {
+        CHARRANGE range{};
+        ::SendMessageW(text, EM_EXGETSEL, 0, reinterpret_cast<LPARAM>(&range));
+        return {range.cpMin, range.cpMax};
+    }
+
     HV::EULAWindowController viewers;
-    viewers.ShowAgreement();
-    const HWND viewer = ::FindWindowW(nullptr, L"Halvorn Software License");
-    ASSERT_NE(viewer, nullptr);
-    ::SetFocus(viewer);
+    HWND viewer = nullptr;
+    HWND text = nullptr;
+};
+
+TEST_F(ViewerKeyboardTest, OpensWithTheFocusInTheTextAndTheCaretAtItsStart) {
+    ASSERT_NE(text, nullptr);
+    EXPECT_EQ(::GetFocus(), text);
+    EXPECT_EQ(Selection(), std::pair(0L, 0L));
+    EXPECT_EQ(HiddenRows(), 0);
+}
+
+TEST_F(ViewerKeyboardTest, KeysScrollAtOnce) {
+    const auto rowsAfter = [this](WPARAM key) {
+        Type(key);
+        return HiddenRows();
+    };
+    ASSERT_EQ(HiddenRows(), 0);
+    const LONG oneDown = rowsAfter(VK_DOWN);
+    EXPECT_GT(oneDown, 0);
+    const LONG twoDown = rowsAfter(VK_DOWN);
+    EXPECT_GT(twoDown, oneDown);
+    EXPECT_EQ(rowsAfter(VK_UP), oneDown);
+    EXPECT_GT(rowsAfter(VK_NEXT), oneDown + 200);
+    EXPECT_EQ(rowsAfter(VK_PRIOR), oneDown);
+    const LONG end = rowsAfter(VK_END);
+    EXPECT_GT(end, oneDown + 200);
+    EXPECT_EQ(rowsAfter(VK_DOWN), end);
+    EXPECT_EQ(rowsAfter(VK_HOME), 0);
+    EXPECT_EQ(rowsAfter(VK_UP), 0);
+}
+
+TEST_F(ViewerKeyboardTest, TabGoesAroundAndSelectsNothing) {
     EXPECT_EQ(Tab(4), (std::vector<int>{kCloseViewer, kSaveLicense, kAgreementItself, kCloseViewer}));
+    EXPECT_EQ(Selection(), std::pair(0L, 0L));
+    EXPECT_EQ(HiddenRows(), 0);
     Type(VK_RETURN);
     EXPECT_EQ(::IsWindow(viewer), FALSE);
 }
 
-TEST_F(KeyboardTest, EscapeClosesTheViewerFromItsText) {
-    HV::EULAWindowController viewers;
-    viewers.ShowAgreement();
-    const HWND viewer = ::FindWindowW(nullptr, L"Halvorn Software License");
-    ASSERT_NE(viewer, nullptr);
-    ::SetFocus(::GetDlgItem(viewer, kAgreementItself));
+TEST_F(ViewerKeyboardTest, ArrowsGoBetweenItsButtons) {
+    Tab(1);
+    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_LEFT}), (std::vector<int>{kSaveLicense, kSaveLicense, kCloseViewer}));
+}
+
+TEST_F(ViewerKeyboardTest, EscapeClosesTheViewerFromItsText) {
+    ASSERT_EQ(::GetFocus(), text);
     Type(VK_ESCAPE);
     EXPECT_EQ(::IsWindow(viewer), FALSE);
+}
+
+TEST_F(FirstPageKeyboardTest, TheFocusComesBackFromTheViewer) {
+    HV::EULAWindowController viewers;
+    const HWND readLicense = controller.welcomePage->readLicenseButton.handle;
+    ::SetFocus(readLicense);
+    viewers.ShowAgreement();
+    ASSERT_NE(::GetFocus(), readLicense);
+    Type(VK_ESCAPE);
+    EXPECT_EQ(::GetFocus(), readLicense);
 }
 
 }  // namespace

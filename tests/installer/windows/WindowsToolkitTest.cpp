@@ -32,7 +32,7 @@ protected:
 };
 
 TEST_F(WindowsToolkitTest, PutsPagesAsChildrenAtTheirPlace) {
-    const Control page = ControlsOf(*window).back();
+    const Control page = ControlsOf(*window).front();
     EXPECT_EQ(page.place, (Area{170, 37, 580, 345}));
     EXPECT_EQ(page.style, 0x50000000U);
     RECT client{};
@@ -42,7 +42,7 @@ TEST_F(WindowsToolkitTest, PutsPagesAsChildrenAtTheirPlace) {
 
 TEST_F(WindowsToolkitTest, PutsTheFinalPageOverTheWholeWindowAndFourRowsMore) {
     toolkit.CreateFinalPage(controller, *window);
-    const Control page = ControlsOf(*window).back();
+    const Control page = ControlsOf(*window).front();
     EXPECT_EQ(page.place, (Area{0, 0, 800, 354}));
     EXPECT_EQ(page.style, 0x50000000U);
 }
