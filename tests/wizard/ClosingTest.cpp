@@ -2,7 +2,13 @@
 
 namespace {
 
-using ClosingTest = WizardTest;
+class ClosingTest : public WizardTest {
+protected:
+    [[nodiscard]] std::string Log() const {
+        return machine().Content(R"(C:\ProgramData\Halvorn\Logs\Tessaly Suite Installer.log)");
+    }
+    const std::string kCancelLine = "Cancel invoked";
+};
 
 TEST_F(ClosingTest, TheTitleBarEndsTheFirstPage) {
     HasEveryHost();
@@ -32,6 +38,21 @@ TEST_F(ClosingTest, TheTitleBarEndsAnInstallWithoutWaitingForIt) {
     EXPECT_TRUE(machine().HasFile(R"(C:\hold.txt)"));
     LetGo();
     EXPECT_FALSE(IsRegistered());
+    // Unlike the button it does not ask the engine to stop.
+    EXPECT_NE(Log().find("Running payload script"), std::string::npos) << Log();
+    EXPECT_EQ(Log().find(kCancelLine), std::string::npos) << Log();
+}
+
+TEST_F(ClosingTest, CancelAsksARunningInstallToStop) {
+    HasEveryHost();
+    HoldAtScript("requirements");
+    RunningWizard wizard(folder);
+    GoToInstalling(wizard);
+    WaitUntilHeld();
+    wizard.Press(wizard.Window(), id::Cancel);
+    EXPECT_EQ(wizard.ExitStatus(), 0U);
+    LetGo();
+    EXPECT_NE(Log().find(kCancelLine), std::string::npos) << Log();
 }
 
 TEST_F(ClosingTest, TheTitleBarEndsTheFinishedWizard) {

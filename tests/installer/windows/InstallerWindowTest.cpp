@@ -3,13 +3,16 @@
 #include <gtest/gtest.h>
 
 #include <array>
+#include <memory>
 #include <set>
 #include <string>
 #include <vector>
 
+#include "hvdeploy/src/DeployJob.h"
 #include "installer/windows/WizardMetrics.h"
 #include "tests/installer/SetupFolder.h"
 #include "tests/installer/windows/WindowTest.h"
+#include "tests/support/LogRecorder.h"
 
 namespace {
 
@@ -146,6 +149,23 @@ TEST_F(InstallerWindowTest, EndsTheLoopWhenItIsClosed) {
     MSG message{};
     ASSERT_NE(::PeekMessageW(&message, nullptr, WM_QUIT, WM_QUIT, PM_REMOVE), FALSE);
     EXPECT_EQ(message.wParam, 0U);
+}
+
+TEST_F(InstallerWindowTest, RaisesNoCancelWhenItIsClosedDuringAnInstall) {
+    HV::DeployJob job("");
+    job.cli = std::make_unique<HV::DeployCLI>(&job);
+    controller.job = &job;
+    controller.state = HV::WizardState::Installing;
+    const LogRecorder log;
+    const std::string cancelLine = "CRIT hvdeploy-detail: Cancel invoked";
+    Make();
+    ::SendMessageW(*window, WM_SYSCOMMAND, SC_CLOSE, 0);
+    EXPECT_EQ(::IsWindow(*window), FALSE);
+    EXPECT_FALSE(log.Has(cancelLine));
+    // The button would have raised it.
+    controller.Perform(HV::kCancelCommand);
+    EXPECT_TRUE(log.Has(cancelLine));
+    controller.job = nullptr;
 }
 
 TEST_F(InstallerWindowTest, GrowsTo800InFourStepsOfTheTimer) {
