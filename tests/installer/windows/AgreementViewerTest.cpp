@@ -4,6 +4,7 @@
 #include <fstream>
 #include <iterator>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "installer/windows/EULAWindow.h"
@@ -81,6 +82,65 @@ TEST_F(AgreementViewerTest, ShowsTheAgreementAsRichText) {
         ::SendMessageW(RichText(Viewer()), WM_GETTEXT, shown.size(), reinterpret_cast<LPARAM>(shown.data()))));
     EXPECT_EQ(shown.substr(0, 24), L"Halvorn Software License");
     EXPECT_EQ(shown.find(L"\\rtf"), std::wstring::npos);
+}
+
+/// What the viewer does with its text control while it comes up, as hooks of the system see it.
+class TextControlWitness {
+public:
+    TextControlWitness() {
+        current = this;
+        creation_ = ::SetWindowsHookExW(WH_CBT, OnCreation, nullptr, ::GetCurrentThreadId());
+        message_ = ::SetWindowsHookExW(WH_CALLWNDPROC, OnMessage, nullptr, ::GetCurrentThreadId());
+    }
+    ~TextControlWitness() {
+        ::UnhookWindowsHookEx(message_);
+        ::UnhookWindowsHookEx(creation_);
+        current = nullptr;
+    }
+    TextControlWitness(const TextControlWitness&) = delete;
+    TextControlWitness& operator=(const TextControlWitness&) = delete;
+
+    std::vector<std::wstring> firstTexts;          // of every rich text control that was made
+    std::vector<std::pair<DWORD, UINT>> settings;  // flags and code page of each text that was set
+
+private:
+    static LRESULT CALLBACK OnCreation(int code, WPARAM window, LPARAM parameter) {
+        if (code == HCBT_CREATEWND) {
+            const CREATESTRUCTW& made = *reinterpret_cast<CBT_CREATEWNDW*>(parameter)->lpcs;
+            std::wstring kind(64, L'\0');
+            kind.resize(static_cast<std::size_t>(
+                ::GetClassNameW(reinterpret_cast<HWND>(window), kind.data(), static_cast<int>(kind.size()))));
+            if (::lstrcmpiW(kind.c_str(), L"RICHEDIT50W") == 0) {
+                current->firstTexts.emplace_back(made.lpszName == nullptr ? L"" : made.lpszName);
+            }
+        }
+        return ::CallNextHookEx(nullptr, code, window, parameter);
+    }
+
+    static LRESULT CALLBACK OnMessage(int code, WPARAM same, LPARAM parameter) {
+        const CWPSTRUCT& sent = *reinterpret_cast<CWPSTRUCT*>(parameter);
+        if (code == HC_ACTION && sent.message == EM_SETTEXTEX) {
+            const SETTEXTEX& as = *reinterpret_cast<SETTEXTEX*>(sent.wParam);
+            current->settings.emplace_back(as.flags, as.codepage);
+        }
+        return ::CallNextHookEx(nullptr, code, same, parameter);
+    }
+
+    static inline TextControlWitness* current = nullptr;
+    HHOOK creation_ = nullptr;
+    HHOOK message_ = nullptr;
+};
+
+TEST_F(AgreementViewerTest, CallsItsTextLicenseUntilItHasTheAgreement) {
+    const TextControlWitness witness;
+    viewers.ShowAgreement();
+    EXPECT_EQ(witness.firstTexts, std::vector<std::wstring>{L"License"});
+}
+
+TEST_F(AgreementViewerTest, HandsTheAgreementOverOnceWithoutFlagsOrCodePage) {
+    const TextControlWitness witness;
+    viewers.ShowAgreement();
+    EXPECT_EQ(witness.settings, (std::vector<std::pair<DWORD, UINT>>{{0, 0}}));
 }
 
 TEST_F(AgreementViewerTest, LetsNobodyWriteIntoTheAgreement) {

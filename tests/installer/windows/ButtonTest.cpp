@@ -255,6 +255,40 @@ TEST_F(ButtonControlTest, IsNotPaintedAgainForTheSameText) {
     EXPECT_FALSE(NeedsPainting());
 }
 
+/// Counts how often the background of a control is erased, while it lives.
+class EraseCounter {
+public:
+    explicit EraseCounter(HWND control) : control_(control) {
+        count = 0;
+        own = reinterpret_cast<WNDPROC>(::SetWindowLongPtrW(control, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(&Count)));
+    }
+    ~EraseCounter() { ::SetWindowLongPtrW(control_, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(own)); }
+    EraseCounter(const EraseCounter&) = delete;
+    EraseCounter& operator=(const EraseCounter&) = delete;
+
+    static inline int count = 0;
+
+private:
+    static LRESULT CALLBACK Count(HWND window, UINT message, WPARAM wide, LPARAM parameter) {
+        count += message == WM_ERASEBKGND ? 1 : 0;
+        return ::CallWindowProcW(own, window, message, wide, parameter);
+    }
+
+    static inline WNDPROC own = nullptr;
+    HWND control_;
+};
+
+TEST_F(ButtonControlTest, IsErasedBeforeItIsPaintedAgain) {
+    ::UpdateWindow(button.handle);
+    const EraseCounter erased(button.handle);
+    button.SetText("Install");
+    ::UpdateWindow(button.handle);
+    EXPECT_EQ(EraseCounter::count, 1);
+    button.SetHighlighted(true);
+    ::UpdateWindow(button.handle);
+    EXPECT_EQ(EraseCounter::count, 2);
+}
+
 TEST_F(ButtonControlTest, IsCalledByItsText) {
     button.SetText("Install");
     EXPECT_EQ(ControlsOf(Parent()).at(0).text, L"Install");
