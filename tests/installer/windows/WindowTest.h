@@ -42,8 +42,8 @@ struct Control {
 };
 std::ostream& operator<<(std::ostream& stream, const Control& control);
 
-/// The windows directly in `parent`, from the top one down: controls in the order in which they were made, the page that
-/// was made last before them.
+/// The windows directly in `parent`, from the top one down: controls in the order in which they were made, the page
+/// that was made last before them.
 std::vector<Control> ControlsOf(HWND parent);
 
 /// The name of the font that the window says it writes in.
