@@ -66,6 +66,16 @@ int HasStreamFailed(voidpf, voidpf stream) {
     return File(stream).HasFailed() ? 1 : 0;
 }
 
+// The same for a file that is somebody else's: it is open already, and stays so.
+
+voidpf UseFile(voidpf file, const void*, int) {
+    return file;
+}
+
+int LeaveFile(voidpf, voidpf) {
+    return 0;
+}
+
 }  // namespace
 
 ArchiveFile::ArchiveFile(std::unique_ptr<RawFile> file) : file_(std::move(file)), buffer_(BufferCapacity) {}
@@ -169,6 +179,13 @@ void FillArchiveFileFunctions(zlib_filefunc64_def& functions) {
     functions.zclose_file = CloseStream;
     functions.zerror_file = HasStreamFailed;
     functions.opaque = nullptr;
+}
+
+void FillArchiveFileFunctions(zlib_filefunc64_def& functions, ArchiveFile& file) {
+    FillArchiveFileFunctions(functions);
+    functions.zopen64_file = UseFile;
+    functions.zclose_file = LeaveFile;
+    functions.opaque = &file;
 }
 
 }  // namespace platform

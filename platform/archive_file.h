@@ -22,7 +22,9 @@ public:
     /// Bytes taken, fewer than `count` after a failure. A failure may show later, at the latest in Close().
     std::size_t Write(const void* bytes, std::size_t count);
     [[nodiscard]] std::uint64_t Position() const { return position_; }
-    void MoveTo(std::uint64_t position) { position_ = position; }
+    void MoveTo(std::uint64_t position) { position_ = lastMove_ = position; }
+    /// Where the last MoveTo() led: the place of the record that was looked at last.
+    [[nodiscard]] std::uint64_t LastMove() const { return lastMove_; }
     /// The size as it will be when everything is written.
     [[nodiscard]] std::uint64_t Size() const;
     /// True once something has failed.
@@ -43,6 +45,7 @@ private:
     std::uint64_t bufferStart_ = 0;
     std::size_t bufferSize_ = 0;
     std::uint64_t position_ = 0;
+    std::uint64_t lastMove_ = 0;
     bool unwritten_ = false;
     bool failed_ = false;
 };

@@ -9,6 +9,8 @@
 /// The door for third-party libraries that open files by themselves, and so know nothing of `fs`.
 namespace platform {
 
+class ArchiveFile;
+
 /// The narrow name under which a library that calls the runtime finds this file: the path itself on Windows, the host's
 /// name hosted.
 std::string LibraryFileName(const fs::path& file);
@@ -24,5 +26,9 @@ std::string LibraryPropertyFile(const fs::path& file);
 /// buffered, so that the many small reads of a zip directory cost no system call each; sizes beyond 4 GB are fine.
 /// Hosted, writing asks the machine's faults, and a failed write shows in the result of the library's own calls.
 void FillArchiveFileFunctions(zlib_filefunc64_def& functions);
+
+/// Fills in functions that use `file`, whatever name the library is given. It stays open when the library is done, and
+/// has to live as long as the library's handle.
+void FillArchiveFileFunctions(zlib_filefunc64_def& functions, ArchiveFile& file);
 
 }  // namespace platform

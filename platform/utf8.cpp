@@ -1,5 +1,6 @@
 #include "platform/utf8.h"
 
+#include <algorithm>
 #include <cstdint>
 
 namespace platform {
@@ -136,6 +137,11 @@ std::string Utf8FromWide(std::wstring_view text) {
         AppendUtf8(narrow, TakeCharacter(text));
     }
     return narrow;
+}
+
+bool IsUtf8(std::string_view text) {
+    const bool ascii = std::ranges::all_of(text, [](char c) { return static_cast<unsigned char>(c) < 0x80; });
+    return ascii || Utf8FromWide(WideFromUtf8(text)) == text;
 }
 
 }  // namespace platform

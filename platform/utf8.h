@@ -12,4 +12,7 @@ namespace platform {
 std::wstring WideFromUtf8(std::string_view text);
 std::string Utf8FromWide(std::wstring_view text);
 
+/// Whether the bytes are UTF-8, with nothing malformed in them.
+bool IsUtf8(std::string_view text);
+
 }  // namespace platform

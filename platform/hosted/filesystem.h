@@ -102,6 +102,14 @@ inline bool is_symlink(const path& item, error_code& error) {
 std::uintmax_t file_size(const path& file);
 std::uintmax_t file_size(const path& file, error_code& error);
 
+/// Bytes of the host's disk on which `item` lies; each number `uintmax_t(-1)` with an error.
+struct space_info {
+    std::uintmax_t capacity;
+    std::uintmax_t free;
+    std::uintmax_t available;
+};
+space_info space(const path& item, error_code& error);
+
 /// Replaces a file that is there, unless it is read-only, and never a folder.
 void rename(const path& from, const path& to);
 void rename(const path& from, const path& to, error_code& error);

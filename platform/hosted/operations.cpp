@@ -1,5 +1,6 @@
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 #include <unistd.h>
 
 #include <array>
@@ -392,6 +393,17 @@ std::uintmax_t file_size(const path& file) {
 }
 std::uintmax_t file_size(const path& file, error_code& error) {
     return AskSize(file, &error);
+}
+
+space_info space(const path& item, error_code& error) {
+    struct statvfs found {};
+    const int number = ErrorOf(::statvfs(HostName(item).c_str(), &found));
+    Report(number, &error, "boost::filesystem::space", item);
+    if (number != 0) {
+        return {Failed, Failed, Failed};
+    }
+    const std::uintmax_t block = found.f_frsize;
+    return {found.f_blocks * block, found.f_bfree * block, found.f_bavail * block};
 }
 
 void rename(const path& from, const path& to) {
