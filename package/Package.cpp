@@ -7,6 +7,7 @@
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "hvframework/StringUtils.h"
+#include "hvframework/XmlNesting.h"
 #include "package/PayloadSources.h"
 #include "package/ZipEntries.h"
 
@@ -101,7 +102,7 @@ bool Package::ReadRootManifest(const std::string& name) {
 
 bool Package::ParseManifestEntry(const std::string& entry, const std::string& name) {
     std::vector<char> bytes;
-    if (ReadZipEntryBytes(zipPath.string(), entry, bytes) != 0) {
+    if (ReadZipEntryBytes(zipPath.string(), entry, bytes, HVL::kLongestXml) != 0) {
         HVL_LOG(Error, "Reading zip file byts of manifest.xml failed for " << name);
         return false;
     }

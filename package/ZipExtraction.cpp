@@ -1,15 +1,16 @@
 #include <algorithm>
-#include <array>
 #include <cstdio>
 #include <memory>
 #include <new>
-#include <string_view>
+#include <unordered_set>
 
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
-#include "hvframework/StringUtils.h"
+#include "package/EntryNames.h"
+#include "package/Inflater.h"
 #include "package/ZipEntries.h"
 #include "platform/files.h"
+#include "platform/filesystem.h"
 
 namespace HV {
 namespace {
@@ -33,38 +34,84 @@ private:
     std::size_t room_ = 0;
 };
 
+/// The folders that extraction makes: those with an entry of their own, and those above them.
+class EntryFolders {
+public:
+    explicit EntryFolders(const ZipEntries& archive) {
+        for (const std::string& name : archive.Directories()) {
+            for (std::string folder = EntryPath(name); !folder.empty() && folders_.insert(folder).second;) {
+                folder = FolderOf(folder);
+            }
+        }
+    }
+
+    /// What is wrong with the folder that a file goes to, in words; empty when nothing is.
+    [[nodiscard]] std::string ProblemOf(const std::string& file) const {
+        const std::string folder = FolderOf(EntryPath(file));
+        return folder.empty() || folders_.contains(folder) ? "" : "its folder " + folder + "/ has no entry of its own";
+    }
+
+private:
+    static std::string FolderOf(const std::string& path) {
+        const auto end = path.rfind('/');
+        return end == std::string::npos ? "" : path.substr(0, end);
+    }
+
+    std::unordered_set<std::string> folders_;
+};
+
+/// Unpacks the open entry into the buffer and gives its bytes; null, with the reason logged, when that cannot be.
+/// An entry without bytes gives what must not be read.
+const char* Unpack(ZipEntries& archive, EntryBuffer& buffer, const std::string& name) {
+    const auto size = static_cast<std::size_t>(archive.FileSize());
+    char* bytes = buffer.Reserve(std::max<std::size_t>(size, 1));
+    if (bytes == nullptr) {
+        LogEntryProblem(name, "there is no memory for its " + std::to_string(size) + " bytes");
+        return nullptr;
+    }
+    if (!archive.ReadFile(bytes)) {
+        LogEntryProblem(name, archive.Problem());
+        return nullptr;
+    }
+    return bytes;
+}
+
 bool WriteAll(std::FILE* file, const char* bytes, std::size_t size) {
     // Unbuffered: the bytes go to the system in one piece, and a full disk shows here and not when the file is closed.
     std::setvbuf(file, nullptr, _IONBF, 0);
-    return std::fwrite(bytes, 1, size, file) == size;
-}
-
-/// Fills the open target with the current entry. An entry without bytes leaves it empty.
-bool WriteCurrentEntry(ZipEntries& archive, EntryBuffer& buffer, std::FILE* file) {
-    const auto size = static_cast<std::size_t>(archive.EntrySize());
-    if (size == 0) {
-        return true;
+    while (size > 0) {
+        const std::size_t piece = std::min<std::size_t>(size, kLargestPiece);
+        if (std::fwrite(bytes, 1, piece, file) != piece) {
+            return false;
+        }
+        bytes += piece;
+        size -= piece;
     }
-    char* bytes = buffer.Reserve(size);
-    return bytes != nullptr && archive.ReadEntry(bytes) && WriteAll(file, bytes, size);
+    return true;
 }
 
-bool ExtractCurrentEntry(ZipEntries& archive, EntryBuffer& buffer, const std::string& target) {
+bool WriteCurrentFile(ZipEntries& archive, EntryBuffer& buffer, const std::string& name, const std::string& target) {
     std::FILE* const file = platform::OpenStream(target, "wb");
     if (file == nullptr) {
+        if (const std::string problem = EntryFolders(archive).ProblemOf(name); !problem.empty()) {
+            LogEntryProblem(name, problem);
+        }
         return false;
     }
-    const bool written = WriteCurrentEntry(archive, buffer, file);
+    const auto size = static_cast<std::size_t>(archive.FileSize());
+    const char* bytes = Unpack(archive, buffer, name);
+    const bool written = bytes != nullptr && WriteAll(file, bytes, size);
     return std::fclose(file) == 0 && written;
 }
 
-int ExtractFile(ZipEntries& archive, EntryBuffer& buffer, const std::string& name, const std::string& destination) {
-    if (!IsSafeEntryName(name) || !archive.OpenEntry(name)) {
+int ExtractFile(ZipEntries& archive, std::size_t place, EntryBuffer& buffer, const std::string& destination) {
+    const std::string& name = archive.Files()[place];
+    if (!archive.OpenFile(place)) {
+        LogEntryProblem(name, archive.Problem());
         HVL_LOG(Error, "ERROR: failed to open zip file entry " << name);
         return -1;
     }
-    const bool extracted = ExtractCurrentEntry(archive, buffer, HVL::FileUtils::JoinPath(destination, name));
-    if (!archive.CloseEntry() || !extracted) {
+    if (!WriteCurrentFile(archive, buffer, name, HVL::FileUtils::JoinPath(destination, name))) {
         HVL_LOG(Error, "ERROR: failed to write zip entry file " << name);
         return -1;
     }
@@ -72,68 +119,79 @@ int ExtractFile(ZipEntries& archive, EntryBuffer& buffer, const std::string& nam
 }
 
 /// Parents are found by `\`, so that is how the folder is handed on; an archive need not list a folder's parents.
-int MakeEntryDirectory(const std::string& name, const std::string& joined) {
-    if (!IsSafeEntryName(name)) {
-        return -1;
-    }
+int MakeEntryDirectory(const std::string& joined) {
     std::string path = HVL::FileUtils::StripTrailingSeparator(joined);
     std::ranges::replace(path, '/', '\\');
     return HVL::FileUtils::CreateDirectories(path);
 }
 
-int ExtractDirectory(const std::string& name, const std::string& destination) {
+int ExtractDirectory(ZipEntries& archive, std::size_t place, const std::string& destination) {
+    const std::string& name = archive.Directories()[place];
     const std::string path = HVL::FileUtils::JoinPath(destination, name);
-    const int result = MakeEntryDirectory(name, path);
+    const bool sound = archive.CheckDirectory(place);
+    if (!sound) {
+        LogEntryProblem(name, archive.Problem());
+    }
+    const int result = sound ? MakeEntryDirectory(path) : -1;
     if (result != 0) {
         HVL_LOG(Error, "ERROR: failed to create directory " << path);
     }
     return result;
 }
 
-std::string UpperCase(std::string_view text) {
-    std::string upper(text);
-    std::ranges::transform(upper, upper.begin(), [](char c) { return c >= 'a' && c <= 'z' ? char(c - 'a' + 'A') : c; });
-    return upper;
-}
-
-/// Names that reach a device from any folder, whatever extension follows. The superscript digits count as digits.
-bool NamesDevice(std::string_view component) {
-    std::string stem = UpperCase(component.substr(0, component.find('.')));
-    stem.erase(stem.find_last_not_of(' ') + 1);
-    static constexpr std::array<std::string_view, 6> kDevices{"CON", "PRN", "AUX", "NUL", "CONIN$", "CONOUT$"};
-    static constexpr std::array<std::string_view, 13> kPorts{"0", "1", "2", "3",        "4",        "5",       "6",
-                                                             "7", "8", "9", "\xC2\xB9", "\xC2\xB2", "\xC2\xB3"};
-    const bool port = HVL::StringUtils::StartsWith(stem, "COM") || HVL::StringUtils::StartsWith(stem, "LPT");
-    return std::ranges::find(kDevices, stem) != kDevices.end() ||
-           (port && std::ranges::find(kPorts, std::string_view(stem).substr(3)) != kPorts.end());
-}
-
-/// Windows drops blanks and dots at the end of a component, which turns ".. " into a step up.
-bool IsSafeComponent(std::string_view component) {
-    if (component.empty() || component == ".") {
+/// Asked before the first byte is written. A disk that does not tell is written to all the same.
+bool HasRoom(const std::string& destination, const ZipEntries& archive) {
+    boost::system::error_code error;
+    const fs::space_info space = fs::space(fs::path(destination), error);
+    const std::uint64_t needed = archive.TotalSize();
+    if (error || needed <= space.available) {
         return true;
     }
-    return component.back() != '.' && component.back() != ' ' && !NamesDevice(component);
+    HVL_LOG(Error, "unpacking takes " << needed << " bytes, and at " << destination << " there are " << space.available
+                                      << " free");
+    return false;
+}
+
+int ExtractEntries(ZipEntries& archive, const std::string& destination) {
+    for (std::size_t place = 0; place < archive.Directories().size(); ++place) {
+        if (const int result = ExtractDirectory(archive, place, destination); result != 0) {
+            return result;
+        }
+    }
+    EntryBuffer buffer;
+    for (std::size_t place = 0; place < archive.Files().size(); ++place) {
+        if (const int result = ExtractFile(archive, place, buffer, destination); result != 0) {
+            return result;
+        }
+    }
+    return 0;
+}
+
+bool CheckFile(ZipEntries& archive, std::size_t place, EntryBuffer& buffer, const EntryFolders& folders) {
+    const std::string& name = archive.Files()[place];
+    if (!archive.OpenFile(place)) {
+        LogEntryProblem(name, archive.Problem());
+        return false;
+    }
+    if (Unpack(archive, buffer, name) == nullptr) {
+        return false;
+    }
+    const std::string problem = folders.ProblemOf(name);
+    if (!problem.empty()) {
+        LogEntryProblem(name, problem);
+    }
+    return problem.empty();
+}
+
+bool CheckDirectory(ZipEntries& archive, std::size_t place) {
+    const bool sound = archive.CheckDirectory(place);
+    if (!sound) {
+        LogEntryProblem(archive.Directories()[place], archive.Problem());
+    }
+    return sound;
 }
 
 }  // namespace
-
-bool IsSafeEntryName(const std::string& name) {
-    constexpr std::string_view kSeparators = "/\\";
-    if (name.empty() || kSeparators.find(name.front()) != std::string_view::npos ||
-        name.find(':') != std::string::npos) {
-        return false;
-    }
-    std::string_view rest(name);
-    while (!rest.empty()) {
-        const auto end = std::min(rest.find_first_of(kSeparators), rest.size());
-        if (!IsSafeComponent(rest.substr(0, end))) {
-            return false;
-        }
-        rest.remove_prefix(std::min(end + 1, rest.size()));
-    }
-    return true;
-}
 
 int ExtractZip(const std::string& archivePath, const std::string& destination) {
     HVL_LOG(Debug, "DEBUG - extracting " << archivePath);
@@ -141,18 +199,21 @@ int ExtractZip(const std::string& archivePath, const std::string& destination) {
     // Whether the destination could be made shows in what is put into it.
     static_cast<void>(HVL::FileUtils::CreateDirectories(destination));
     ZipEntries archive(archivePath);
-    for (const std::string& name : archive.Directories()) {
-        if (const int result = ExtractDirectory(name, destination); result != 0) {
-            return result;
-        }
+    return HasRoom(destination, archive) ? ExtractEntries(archive, destination) : -1;
+}
+
+int CheckZip(const std::string& archivePath) {
+    ZipEntries archive(archivePath);
+    bool sound = archive.IsOpen();
+    for (std::size_t place = 0; place < archive.Directories().size(); ++place) {
+        sound &= CheckDirectory(archive, place);
     }
+    const EntryFolders folders(archive);
     EntryBuffer buffer;
-    for (const std::string& name : archive.Files()) {
-        if (const int result = ExtractFile(archive, buffer, name, destination); result != 0) {
-            return result;
-        }
+    for (std::size_t place = 0; place < archive.Files().size(); ++place) {
+        sound &= CheckFile(archive, place, buffer, folders);
     }
-    return 0;
+    return sound ? 0 : -1;
 }
 
 }  // namespace HV

@@ -8,8 +8,8 @@
 
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
+#include "package/EntryNames.h"
 #include "package/Package.h"
-#include "package/ZipEntries.h"
 #include "platform/libraries.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/SoundPackage.h"
@@ -191,7 +191,7 @@ HV::Manifest WriteAndCheck(const std::vector<Item>& items, const fs::path& outpu
     const fs::path unfinished = work.Path() / output.filename();
     WriteArchive(items, unfinished);
     HV::Package package(unfinished);
-    if (!package.Validate(false)) {
+    if (!IsSound(package)) {
         throw PackageError(output.filename().string() + " would not be a sound package");
     }
     fs::rename(unfinished, output);
