@@ -161,6 +161,56 @@ TEST_F(HvpackTest, ChecksSoundPackagesWithStatusZero) {
     EXPECT_EQ(err, "");
 }
 
+/// Packages that pass for sound until their entries are unpacked.
+class UnpackablePackageTest : public HvpackTest {
+protected:
+    UnpackablePackageTest() { description.Payload("plugin").File("Glow.aex", "bytes"); }
+
+    void ExpectRefusedFor(const ArchiveEntry& entry, const std::string& reason) {
+        PackageBuilder spoilt = description;
+        (void)spoilt.RawEntry(entry).Named("glow.hvpkg").WriteTo(R"(C:\out)");
+        const auto before = machine.Files();
+        EXPECT_EQ(Run({"check", R"(C:\out\glow.hvpkg)"}), 1);
+        EXPECT_EQ(out, "");
+        EXPECT_EQ(err, "ERROR: zip entry " + entry.name + ": " + reason +
+                           "\nhvpack: C:\\out\\glow.hvpkg is not a sound package\n");
+        EXPECT_EQ(Run({"table", R"(C:\out)"}), 1) << "what is not sound has no row";
+        EXPECT_EQ(machine.Files(), before);
+    }
+
+    PackageBuilder description{"com.halvorn.glow"};
+};
+
+TEST_F(UnpackablePackageTest, AreRefusedForEveryKindOfEntryThatExtractionRefuses) {
+    ExpectRefusedFor({.name = "damaged", .bytes = "x", .claimedChecksum = 7}, "its bytes do not match their checksum");
+    ExpectRefusedFor({.name = "secret", .bytes = "x", .method = 0, .flags = 1}, "it is encrypted");
+    ExpectRefusedFor({.name = "odd", .bytes = "x", .method = 14}, "it is compressed by the unknown method 14");
+    ExpectRefusedFor({.name = "con.txt", .bytes = "x"}, "its name cannot be used on Windows");
+    ExpectRefusedFor({.name = "../up", .bytes = "x"}, "its name cannot be used on Windows");
+    ExpectRefusedFor({.name = "Gl\xFC", .bytes = "x"}, "its name is not UTF-8");
+    ExpectRefusedFor({.name = "one", .bytes = "x", .localName = "two"}, "its own header names it two");
+    ExpectRefusedFor({.name = "short", .bytes = "abc", .packed = PackedBytes("abcdef")},
+                     "it unpacks to more than it claims");
+}
+
+TEST_F(UnpackablePackageTest, HaveTheirMissingFoldersNamed) {
+    ExpectRefusedFor({.name = "docs/deep/note.txt", .bytes = "x"}, "its folder docs/deep/ has no entry of its own");
+    description.Folder("docs/deep");
+    description.RawEntry({.name = "docs/deep/note.txt", .bytes = "x"});
+    (void)description.Named("glow.hvpkg").WriteTo(R"(C:\out)");
+    EXPECT_EQ(Run({"check", R"(C:\out\glow.hvpkg)"}), 0) << err;
+}
+
+TEST_F(UnpackablePackageTest, AreRefusedForTwoNamesThatAreOneOnWindows) {
+    description.File("read.me", "1").File("READ.ME", "2");
+    (void)description.Named("glow.hvpkg").WriteTo(R"(C:\out)");
+    EXPECT_EQ(Run({"check", R"(C:\out\glow.hvpkg)"}), 1);
+    EXPECT_EQ(err,
+              "ERROR: zip entry read.me: to Windows it has the same name as READ.ME\n"
+              "ERROR: zip entry READ.ME: to Windows it has the same name as read.me\n"
+              "hvpack: C:\\out\\glow.hvpkg is not a sound package\n");
+}
+
 /// A package with one payload for hosts and one for a system directory, which a test spoils.
 class DoubtfulPackageTest : public HvpackTest {
 protected:

@@ -1,5 +1,6 @@
 #include "tools/hvpack/SoundPackage.h"
 
+#include "package/ZipEntries.h"
 #include "tools/hvpack/PackageError.h"
 
 namespace HVPack {
@@ -9,12 +10,16 @@ bool IsNamedAsPackage(const fs::path& file) {
     return extension == ".hvpkg" || extension == ".zip";
 }
 
+bool IsSound(HV::Package& package) {
+    return package.Validate(false) && HV::CheckZip(package.zipPath.string()) == 0;
+}
+
 HV::Package SoundPackage(const std::string& file) {
     HV::Package package{fs::path(file)};
     if (package.zipPath.empty()) {
         throw PackageError(file + " is not named .hvpkg or .zip");
     }
-    if (!package.Validate(false)) {
+    if (!IsSound(package)) {
         throw PackageError(file + " is not a sound package");
     }
     return package;
