@@ -63,6 +63,17 @@ TEST_F(BadInputTest, AnEmptyFileIsNoPackage) {
     FailsWith("ReadZipEntries failed for glow.hvpkg");
 }
 
+TEST_F(BadInputTest, NamesThatCannotBeWrittenLeaveNoTemporaryFiles) {
+    std::size_t rounds = 0;
+    for (const std::string name : {"Gl\xFC.dll", "a\x01.dll", "a?.dll", "\xED\xA0\x80/"}) {
+        SCOPED_TRACE(name);
+        FailsToExtract(name, {.bytes = ""});
+        EXPECT_TRUE(LogHas("zip entry " + name + ": its name ")) << machine.Content(kLog);
+        ++rounds;
+    }
+    EXPECT_EQ(rounds, 4U);
+}
+
 TEST_F(BadInputTest, ATruncatedArchiveFailsWhereverItIsCut) {
     const std::string whole = Glow().Bytes();
     std::size_t rounds = 0;
