@@ -31,6 +31,14 @@ if(HV_FUZZ)
     add_compile_options(-fsanitize=fuzzer-no-link)
 endif()
 
+# What ships ends rather than go on with a stack or a buffer that has been written over; scripts/windows-libraries has the
+# same for other people's code. Windows 10 is the least, and says so itself to whoever starts a program on an older one.
+if(WIN32)
+    add_compile_options(-fstack-protector-strong $<$<CONFIG:Release>:-D_FORTIFY_SOURCE=2>)
+    add_link_options(-fstack-protector-strong)
+    add_link_options(-Wl,--major-os-version,10,--minor-os-version,0,--major-subsystem-version,10,--minor-subsystem-version,0)
+endif()
+
 # What ships is stripped and says nothing of the time at which it was made; it may be loaded anywhere, and its data are
 # not run.
 if(WIN32)
