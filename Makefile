@@ -7,7 +7,7 @@ SHELL := /bin/bash
 export CCACHE_BASEDIR := $(CURDIR)
 export CCACHE_NOHASHDIR := 1
 
-.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench fuzz format lint lint-changed tidy clean
+.PHONY: help setup demo demo-windows demo-windows-line release pictures test test-hosted test-asan test-tsan test-windows bench prove fuzz format lint lint-changed tidy clean
 
 help:
 	@echo "make demo                install the sample suite on a fresh machine and show what came of it"
@@ -20,6 +20,7 @@ help:
 	@echo "make test-hosted         the tests of one target; also: test-windows"
 	@echo "make test-asan           the hosted tests under sanitizers; also: test-tsan"
 	@echo "make bench               speed and memory, against standard tools"
+	@echo "make prove               the sample as an upgrade, broken in every way, and what became of the machine"
 	@echo "make fuzz                bytes that crash, stall or bloat a reader; FUZZ_SECONDS=30"
 	@echo "make format              apply .clang-format"
 	@echo "make lint                form, spelling, house rules and clang-tidy of all that ships"
@@ -77,6 +78,9 @@ $(PRESETS:%=test-on-%): test-on-%: build-%
 
 bench: build-hosted
 	@bench/run
+
+prove: build-hosted
+	@build/hosted/bin/prove build/hosted/bin/hvdeploy build/hosted/bin/packages samples/machines/everything.reg
 
 fuzz: setup
 	@echo "== Building the preset fuzz"

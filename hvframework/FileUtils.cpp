@@ -13,6 +13,7 @@
 #include "hvframework/StringUtils.h"
 #include "platform/files.h"
 #include "platform/filesystem.h"
+#include "platform/removal.h"
 
 namespace HVL::FileUtils {
 namespace {
@@ -225,42 +226,10 @@ int CreateDirectories(const std::string& path) {
     return result != 0 && Exists(path) ? 0 : result;
 }
 
-namespace {
-
-int DeleteEntry(const std::string& path, const fs::file_status& status);
-
-int DeleteDirectory(const std::string& path) {
-    error_code error;
-    for (fs::directory_iterator entry(fs::path(path), error), end; !error && entry != end; entry.increment(error)) {
-        error_code ignored;  // an entry of unknown kind is tried as a file, and the result tells
-        const int result = DeleteEntry(entry->path().string(), entry->symlink_status(ignored));
-        if (result != 0) {
-            return result;
-        }
-    }
-    return !error && platform::RemoveEmptyDirectory(path) ? 0 : -1;
-}
-
 // A link or a junction is removed as what it is. Someone may have moved a plug-in folder to another disk and left a
 // junction in its place: following it would empty a folder that no package has put there, and that no stash holds.
-int DeleteEntry(const std::string& path, const fs::file_status& status) {
-    if (fs::is_directory(status)) {
-        return DeleteDirectory(path);
-    }
-    const int result = platform::RemoveFile(path);
-    if (result == 0 || fs::is_regular_file(status)) {
-        return result;
-    }
-    // A link onto a directory is itself one to Windows, and goes only this way.
-    return platform::RemoveEmptyDirectory(path) ? 0 : result;
-}
-
-}  // namespace
-
 int DeleteFileOrDirectory(const std::string& path) {
-    error_code error;
-    const fs::file_status status = fs::symlink_status(fs::path(path), error);
-    return fs::exists(status) ? DeleteEntry(path, status) : 0;
+    return platform::RemoveTree(path);
 }
 
 namespace {

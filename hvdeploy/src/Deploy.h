@@ -14,6 +14,7 @@
 #include "hvdeploy/src/ProgressListener.h"
 #include "hvdeploy/src/UninstallScripts.h"
 #include "hvframework/ProductData.h"
+#include "hvframework/TempFolder.h"
 #include "package/Package.h"
 #include "package/ValidationTable.h"
 #include "platform/filesystem.h"
@@ -133,7 +134,7 @@ private:
     EngineResult InstallValidated(Package& package, float progressPoints, std::string message);
     EngineResult PlacePackage(Package& package, float progressPoints, const std::string& message);
     bool Extract(Package& package);
-    void RemoveTempFiles(const Package& package) const;
+    void RemoveTempFiles(const Package& package);
     EngineResult RollBack(EngineResult result);
     void HandOverToUninstall(const Package& package, const std::vector<std::string>& installedFiles);
     bool WriteUninstallScript(const Package& package, const std::vector<std::string>& installedFiles);
@@ -181,6 +182,7 @@ private:
     bool fatalErrorTest = false;
     std::vector<std::string> installedIdentifiers;
     std::vector<Package> deployedPackages;
+    HVL::TempFolder packageFolder;  // where the package that is being placed is unpacked
     std::vector<std::string> skipList;
     std::map<std::string, ValidationInfo> validationInfo;
     std::uint64_t totalPackageBytes = 0;

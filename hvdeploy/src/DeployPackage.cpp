@@ -117,11 +117,13 @@ EngineResult Deploy::InstallValidated(Package& package, float progressPoints, st
 // A package that does not extract fails the run without a way back: nothing of it has reached the machine, and what
 // earlier packages placed stays.
 bool Deploy::Extract(Package& package) {
-    const std::string folder = FileUtils::MakeTempPath("tmp", FileUtils::GetTempDirectory());
-    if (package.ExtractTo(folder)) {
+    packageFolder = TempFolder("tmp");
+    const std::string folder = packageFolder.Path();
+    if (packageFolder.IsThere() && package.ExtractTo(folder)) {
         return true;
     }
     HVL_LOG(Error, "Failed to extract package " << package.GetName());
+    packageFolder.LetGo();
     FileUtils::DeleteFileOrDirectory(folder);
     return false;
 }
@@ -144,11 +146,12 @@ EngineResult Deploy::PlacePackage(Package& package, float progressPoints, const 
     return result;
 }
 
-void Deploy::RemoveTempFiles(const Package& package) const {
+void Deploy::RemoveTempFiles(const Package& package) {
     if (!package.IsExtracted()) {
         return;
     }
     HVL_LOG(Debug, "Cleaning up temp files at " << package.extractedPath);
+    packageFolder.LetGo();
     if (const int error = FileUtils::DeleteFileOrDirectory(package.extractedPath.string()); error != 0) {
         HVL_LOG(Error, "attempt to remove temp files returned " << error);
     }

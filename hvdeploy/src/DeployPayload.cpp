@@ -4,6 +4,7 @@
 
 #include "hvdeploy/src/Deploy.h"
 #include "hvdeploy/src/EntryTrace.h"
+#include "hvdeploy/src/HeldTarget.h"
 #include "hvdeploy/src/TargetDirectories.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
@@ -200,13 +201,16 @@ void Deploy::CopyPayloadItems(const Payload& payload, const Package& package, co
     std::vector<PayloadPathPair> items;
     package.GetPayloadPaths(destDir, payload, items);
     HVL_LOG(Debug, "Found " << items.size() << " items to copy.");
+    HeldTarget target;
     for (const PayloadPathPair& item : items) {
         const fs::path parent = item.destination.parent_path();
         if (parent.empty()) {
             HVL_LOG(Warn, "Destination parent path is an empty string, cannot process this payload.");
             continue;
         }
-        if (!EnsureParent(parent) || !CopyPayloadItem(item)) {
+        // What is missing is made below a folder that is held, and is then itself held.
+        if (!target.HoldNearest(parent) || !EnsureParent(parent) || !target.HoldNearest(parent) ||
+            !CopyPayloadItem(item)) {
             result = kPlacementFailed;
             return;
         }
@@ -219,7 +223,7 @@ void Deploy::CopyPayloadItems(const Payload& payload, const Package& package, co
 bool Deploy::CopyPayloadItem(const PayloadPathPair& item) {
     const std::string source = item.source.string();
     const std::string destination = item.destination.string();
-    if (fs::exists(item.destination)) {
+    if (fs::exists(item.destination) || fs::is_symlink(item.destination)) {
         rollback.StashExistingFile(item.destination);
     }
     HVL_LOG(Debug, "Copying from: " << source << "\n to: " << destination);

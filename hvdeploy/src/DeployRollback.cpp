@@ -3,6 +3,7 @@
 #include <stdexcept>
 
 #include "hvdeploy/src/EntryTrace.h"
+#include "hvdeploy/src/HeldTarget.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 
@@ -42,9 +43,9 @@ bool Move(const std::string& from, const std::string& to) {
 
 }  // namespace
 
-DeployRollback::DeployRollback() {
-    const std::string folder = FileUtils::MakeTempPath("hvdeploystash", FileUtils::GetTempDirectory());
-    if (FileUtils::CreateDirectories(folder) != 0 || !FileUtils::DirectoryExists(folder)) {
+DeployRollback::DeployRollback() : stashFolder("hvdeploystash") {
+    const std::string folder = stashFolder.Path();
+    if (!stashFolder.IsThere() || FileUtils::CreateDirectories(folder) != 0 || !FileUtils::DirectoryExists(folder)) {
         throw std::runtime_error("Failed to create stash directory for rollback.");
     }
     stashDir = folder;
@@ -83,11 +84,12 @@ void DeployRollback::Rollback() {
 }
 
 void DeployRollback::RemoveInstalledFiles() {
+    HeldTarget target;
     for (const auto& package : installedFiles) {
         for (const auto& payload : package.second) {
             for (const fs::path& path : payload.second.paths) {
                 boost::system::error_code ignored;
-                if (!fs::exists(path, ignored)) {
+                if (!fs::exists(path, ignored) || !target.HoldNearest(path.parent_path())) {
                     continue;
                 }
                 HVL_LOG(Debug, "Removing file at " << path);
@@ -103,10 +105,13 @@ void DeployRollback::RemoveInstalledFiles() {
 // Fixed (contracts, rollback): in the order of stashing and not the other way round. Where two payloads placed one
 // path, the later entry goes back last and wins.
 void DeployRollback::RestoreStashedFiles() {
+    HeldTarget target;
     for (const auto& [original, stashed] : stashedFiles) {
         HVL_LOG(Debug, "Restoring original file at " << original);
-        // What cannot be put back has no message of its own.
-        (void)Move(stashed.string(), original.string());
+        if (target.HoldNearest(original.parent_path())) {
+            // What cannot be put back has no message of its own.
+            (void)Move(stashed.string(), original.string());
+        }
     }
 }
 
@@ -114,6 +119,7 @@ void DeployRollback::DeleteStash() {
     boost::system::error_code ignored;
     if (fs::exists(stashDir, ignored)) {
         HVL_LOG(Debug, "Deleting rollback stash directory.");
+        stashFolder.LetGo();
         FileUtils::DeleteFileOrDirectory(stashDir.string());
     }
 }

@@ -6,6 +6,7 @@
 #include <utility>
 #include <vector>
 
+#include "hvframework/TempFolder.h"
 #include "platform/filesystem.h"
 
 namespace HV {
@@ -16,8 +17,8 @@ namespace HV {
 /// does, and calls Rollback(). The records live in memory only. Not thread-safe: the deployment's thread owns it.
 class DeployRollback {
 public:
-    /// Makes the stash folder in the user's temporary folder. Throws std::runtime_error when it cannot: without a way
-    /// back there is no way forward.
+    /// Makes the stash folder in the user's temporary folder, for this run alone (TempFolder). Throws
+    /// std::runtime_error when it cannot: without a way back there is no way forward.
     DeployRollback();
 
     /// Deletes the stash with all that is left in it.
@@ -58,6 +59,7 @@ private:
     void RestoreStashedFiles();
     void DeleteStash();
 
+    HVL::TempFolder stashFolder;
     std::vector<std::pair<fs::path, fs::path>> stashedFiles;  // original place, place in the stash
     fs::path stashDir;
     std::map<std::string, std::map<std::string, InstalledFiles>> installedFiles;

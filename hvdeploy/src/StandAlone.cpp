@@ -7,6 +7,7 @@
 #include "hvdeploy/src/HVDeployCLI.h"
 #include "hvdeploy/src/Interrupts.h"
 #include "hvdeploy/src/ProgressBar.h"
+#include "platform/redirection_guard.h"
 #include "platform/win32.h"
 
 namespace HV {
@@ -141,6 +142,7 @@ std::string LineFromArguments(const std::vector<std::string>& arguments) {
 }
 
 int RunStandAlone(const std::vector<std::string>& arguments) {
+    (void)platform::RefusePlantedJunctions();
     if (arguments.empty()) {
         std::cerr << kUsage;
         return 1;

@@ -8,6 +8,7 @@
 #include "installer/WinWizardController.h"
 #include "installer/windows/WindowSystem.h"
 #include "installer/windows/WindowsToolkit.h"
+#include "platform/redirection_guard.h"
 #include "platform/windows/atl.h"
 #include "platform/windows/script_console.h"
 #include "platform/windows/wtl.h"
@@ -52,6 +53,7 @@ int ShowWizard(HINSTANCE instance, int showCommand) {
 }  // namespace
 
 int RunWizard(HINSTANCE instance, int showCommand) {
+    (void)platform::RefusePlantedJunctions();
     platform::OpenMissingStandardStreams();
     PrepareConsoleForScripts();
     const WindowSystem windows;

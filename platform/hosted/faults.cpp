@@ -6,6 +6,8 @@
 #include <optional>
 #include <stdexcept>
 
+#include "platform/hosted/held_folders.h"
+
 namespace hosted {
 namespace {
 
@@ -56,7 +58,7 @@ int Faults::CheckArmed(Operation operation, const std::string& hostPath, std::ui
     if (CountAndFail(operation)) {
         return ErrorOf(operation);
     }
-    if (IsHeld(operation, hostPath)) {
+    if (IsHeld(operation, HeldFolders::All().Back(hostPath))) {
         return EACCES;
     }
     return operation == Operation::Write && !HasSpaceFor(bytes) ? ENOSPC : 0;
@@ -65,7 +67,9 @@ int Faults::CheckArmed(Operation operation, const std::string& hostPath, std::ui
 int Faults::CheckRenameArmed(const std::string& from, const std::string& to) {
     const std::lock_guard guard(mutex_);
     const bool fails = CountAndFail(Operation::Rename);
-    return fails || IsHeld(Operation::Rename, from) || IsHeld(Operation::Rename, to) ? EACCES : 0;
+    const HeldFolders& folders = HeldFolders::All();
+    const bool held = IsHeld(Operation::Rename, folders.Back(from)) || IsHeld(Operation::Rename, folders.Back(to));
+    return fails || held ? EACCES : 0;
 }
 
 bool Faults::CountAndFail(Operation operation) {

@@ -18,6 +18,7 @@
 #include <vector>
 
 #include "platform/hosted/failure.h"
+#include "platform/hosted/held_folders.h"
 #include "platform/utf8.h"
 
 namespace hosted {
@@ -478,19 +479,21 @@ std::wstring Machine::CurrentFolderOnC() const {
 std::string Machine::HostPath(std::wstring_view windowsPath) const {
     if (IsRelative(windowsPath)) {
         if (const std::wstring folder = CurrentFolderOnC(); !folder.empty()) {
-            return HostName<wchar_t>(*this, folder + L'\\' + std::wstring(windowsPath)).Build();
+            return HeldFolders::All().Through(
+                HostName<wchar_t>(*this, folder + L'\\' + std::wstring(windowsPath)).Build());
         }
     }
-    return HostName<wchar_t>(*this, windowsPath).Build();
+    return HeldFolders::All().Through(HostName<wchar_t>(*this, windowsPath).Build());
 }
 
 std::string Machine::HostPath(std::string_view windowsPath) const {
     if (IsRelative(windowsPath)) {
         if (const std::wstring folder = CurrentFolderOnC(); !folder.empty()) {
-            return HostName<char>(*this, platform::Utf8FromWide(folder) + '\\' + std::string(windowsPath)).Build();
+            return HeldFolders::All().Through(
+                HostName<char>(*this, platform::Utf8FromWide(folder) + '\\' + std::string(windowsPath)).Build());
         }
     }
-    return HostName<char>(*this, windowsPath).Build();
+    return HeldFolders::All().Through(HostName<char>(*this, windowsPath).Build());
 }
 
 std::wstring Machine::WindowsPath(std::string_view hostPath) const {

@@ -45,7 +45,8 @@ public:
     ///
     /// What Windows cannot find (a missing drive, a network share) becomes a path below /dev/null, where nothing exists
     /// and nothing can be made. What it refuses (characters, names of devices, a separator behind a file's name)
-    /// becomes a name that the host refuses too.
+    /// becomes a name that the host refuses too. A name below a folder that is held (held_folders.h) leads through the
+    /// open folder.
     [[nodiscard]] std::string HostPath(std::wstring_view windowsPath) const;
     /// The same for UTF-8.
     [[nodiscard]] std::string HostPath(std::string_view windowsPath) const;

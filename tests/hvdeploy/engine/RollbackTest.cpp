@@ -1,6 +1,6 @@
 // The way back: what was installed goes, what was there comes back.
-#include "hvframework/FileUtils.h"
 #include "tests/hvdeploy/engine/EngineTest.h"
+#include "tests/support/UnreadableFile.h"
 
 namespace {
 
@@ -14,15 +14,6 @@ protected:
 class EngineRollbackTest : public EngineTest {};
 
 constexpr const char* kFile = R"(C:\Data\Glow.dll)";
-
-/// Puts a file in the place of the one stash that is there, so that nothing can be moved or copied into it.
-void SpoilStash(Machine& machine) {
-    const std::vector<std::string> entries = machine.TempEntries();
-    ASSERT_EQ(entries.size(), 1U);
-    const std::string stash = machine.TempFolder() + "\\" + entries[0];
-    ASSERT_EQ(HVL::FileUtils::DeleteFileOrDirectory(stash), 0);
-    machine.Has(stash, "no folder");
-}
 
 }  // namespace
 
@@ -64,8 +55,10 @@ TEST_F(RollbackTest, WarnsOfAnItemThatCannotBeMovedAside) {
 TEST_F(RollbackTest, WarnsOfAnItemThatCannotBeCopiedToTheStashOnAnotherVolume) {
     machine.Has(kFile, "old");
     HV::DeployRollback rollback;
-    SpoilStash(machine);
-    EXPECT_NO_THROW(rollback.StashExistingFile(fs::path(R"(c:\Data\Glow.dll)")));
+    {
+        const UnreadableFile unreadable(machine, kFile);
+        EXPECT_NO_THROW(rollback.StashExistingFile(fs::path(R"(c:\Data\Glow.dll)")));
+    }
     EXPECT_TRUE(log.Has(WarnLine(R"(Failed to move/copy existing item to rollback stash, from "c:\Data\Glow.dll")")))
         << log.Text();
     EXPECT_EQ(machine.Content(kFile), "old");
