@@ -34,6 +34,11 @@ constexpr std::uint64_t kSpaceStep = 4096;
 /// So many runs one after the other without a sign of the fault mean that it lies behind the run's end.
 constexpr int kQuietRuns = 25;
 
+// What the log says of the outcomes that rules name.
+constexpr const char* kGuard = "exception deploying payload";
+constexpr const char* kStashing = "stashing existing file in case of rollback, from ";
+constexpr const char* kRestoring = "Restoring original file at ";
+
 std::string Read(const host::path& file) {
     std::ifstream stream(file, std::ios::binary);
     return {std::istreambuf_iterator<char>(stream), {}};
@@ -199,7 +204,7 @@ private:
         }
         const std::string from = "dir=" + packages_.string();
         const std::string log = "log=" + (machine / "log").string();
-        execl(program_.c_str(), program_.c_str(), from.c_str(), log.c_str(), nullptr);
+        execl(program_.c_str(), program_.c_str(), from.c_str(), log.c_str(), "loglevel=DEBUG", nullptr);
         _exit(127);
     }
 
@@ -231,31 +236,64 @@ private:
             return "the records of the stash live in memory: after a kill it stays, with every file that was moved "
                    "aside";
         }
-        if (outcome.Says("Failed to extract package") && EachIsOldOrNew(outcome, false)) {
+        if (outcome.Says("Failed to extract package") && EachIsOldOrNew(outcome, {})) {
             return "a package that does not extract ends the run without a way back: each file is the old or the new "
                    "one";
         }
-        if (outcome.Says("exception deploying payload") && EachIsOldOrNew(outcome, true)) {
+        if (outcome.Says(kGuard) && EachIsOldOrNew(outcome, ItemsOfExceptions(outcome))) {
             return "an exception in the copy loop keeps the result: what was moved aside for that item is gone";
         }
-        if (outcome.Says("Failed to move/copy existing item") && EachIsOldOrNew(outcome, false)) {
+        if (outcome.Says("Failed to move/copy existing item") && EachIsOldOrNew(outcome, {})) {
             return "what cannot be moved aside stays, and the copy meets it";
         }
-        if (outcome.Says("failed to delete installed file") && EachIsOldOrNew(outcome, false)) {
+        if (outcome.Says("failed to delete installed file") && EachIsOldOrNew(outcome, {})) {
             return "what cannot be removed on the way back stays";
         }
-        if (outcome.Says("Restoring original file") && EachIsOldOrNew(outcome, true)) {
+        if (outcome.Says(kRestoring) && EachIsOldOrNew(outcome, ItemsNamed(outcome.log, kRestoring))) {
             return "what cannot be put back has no message, and goes with the stash";
         }
         return {};
     }
 
-    [[nodiscard]] bool EachIsOldOrNew(const Outcome& outcome, bool oneMayBeMissing) const {
-        std::size_t missing = 0;
-        for (const auto& [path, content] : oldFiles_) {
-            missing += outcome.files.count(path) == 0 ? 1U : 0U;
+    /// The items in quotes behind `words` in the log, as paths in the machine's folder.
+    static std::vector<std::string> ItemsNamed(const std::string& log, const std::string& words) {
+        std::vector<std::string> items;
+        for (std::size_t at = log.find(words); at != std::string::npos; at = log.find(words, at + 1)) {
+            const std::size_t begin = log.find("\"C:", at);
+            if (begin != std::string::npos) {
+                std::string item = log.substr(begin + 3, log.find('"', begin + 1) - begin - 3);
+                std::ranges::replace(item, '\\', '/');
+                items.push_back(LowerCase("drive_c" + item));
+            }
         }
-        return missing <= (oneMayBeMissing ? 1U : 0U) && std::ranges::all_of(outcome.files, [&](const auto& item) {
+        return items;
+    }
+
+    /// For each exception the item that had just been moved aside: it alone may be gone.
+    static std::vector<std::string> ItemsOfExceptions(const Outcome& outcome) {
+        std::vector<std::string> items;
+        for (std::size_t at = outcome.log.find(kGuard); at != std::string::npos;
+             at = outcome.log.find(kGuard, at + 1)) {
+            const std::vector<std::string> before = ItemsNamed(outcome.log.substr(0, at), kStashing);
+            if (!before.empty()) {
+                items.push_back(before.back());
+            }
+        }
+        return items;
+    }
+
+    static bool IsBelow(const std::string& path, const std::vector<std::string>& items) {
+        const std::string lower = LowerCase(path);
+        return std::ranges::any_of(
+            items, [&](const std::string& item) { return lower == item || lower.rfind(item + "/", 0) == 0; });
+    }
+
+    /// Each file is the old or the new one, and none is missing but in the items that `mayMiss` names.
+    [[nodiscard]] bool EachIsOldOrNew(const Outcome& outcome, const std::vector<std::string>& mayMiss) const {
+        const bool nothingElseMisses = std::ranges::all_of(oldFiles_, [&](const auto& item) {
+            return outcome.files.count(item.first) != 0 || IsBelow(item.first, mayMiss);
+        });
+        return nothingElseMisses && std::ranges::all_of(outcome.files, [&](const auto& item) {
                    return Is(oldFiles_, item) || Is(newFiles_, item);
                });
     }
