@@ -10,6 +10,7 @@
 #include "installer/SharedDirectory.h"
 #include "installer/WinWizardController.h"
 #include "installer/WizardBoxes.h"
+#include "platform/command_processor.h"
 #include "system/SystemDirectories.h"
 
 namespace HV {
@@ -57,6 +58,9 @@ void WinWizardController::CreateInstallingPage() {
 
 // Packages that the user does not see are not on the page, so the line never skips them.
 void WinWizardController::StartInstall() {
+    // Where the wizard was started is where the release lies, often a folder of downloads: no script is to find its
+    // programs there. All paths of the line are whole ones.
+    platform::EnterSystemFolder();
     const InstallerModel& model = InstallerModel::Instance();
     job =
         KeptJob(InstallLine({toolkit_.UncheckedIdentifiers(*selectionPage), LogPathPrefix(model.suite.GetIdentifier()),

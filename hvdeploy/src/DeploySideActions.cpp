@@ -20,10 +20,25 @@ using namespace HVL;
 constexpr const char* kOwner = "HV::Deploy::";
 constexpr unsigned kBroadcastTimeoutMilliseconds = 1000;
 
+// Whether `line` begins with a path in quotes. A quoted word without a separator is a command like any other, and a
+// second quote in place of the path means that the author has put quotes around the whole already.
+bool BeginsWithQuotedPath(const std::string& line) {
+    const std::size_t end = line.starts_with('"') ? line.find('"', 1) : std::string::npos;
+    return end != std::string::npos && line.substr(1, end - 1).find_first_of("\\/") != std::string::npos;
+}
+
+// The command processor takes the first and the last quote off a line that begins with one, but for a line of one kind:
+// two quotes in all, and between them the name of a program with a blank and without any of &<>()@^|. A path that is
+// not of that kind, as in the folder of a user who is called "A&B", would lose its quotes, and its parts be taken for
+// commands. So the line gets one more pair, which is the one that goes.
+std::string ForCommandProcessor(const std::string& line) {
+    return BeginsWithQuotedPath(line) ? "\"" + line + "\"" : line;
+}
+
 // Runs `line` through the command processor and collects what it prints on standard output.
 int RunCommandCapture(const std::string& line, std::string& output) {
     output.clear();
-    std::FILE* const pipe = _popen(line.c_str(), "r");
+    std::FILE* const pipe = _popen(ForCommandProcessor(line).c_str(), "r");
     if (pipe == nullptr) {
         return -1;
     }

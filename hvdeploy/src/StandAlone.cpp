@@ -7,6 +7,7 @@
 #include "hvdeploy/src/HVDeployCLI.h"
 #include "hvdeploy/src/Interrupts.h"
 #include "hvdeploy/src/ProgressBar.h"
+#include "platform/command_processor.h"
 #include "platform/redirection_guard.h"
 #include "platform/win32.h"
 
@@ -148,6 +149,7 @@ int RunStandAlone(const std::vector<std::string>& arguments) {
         return 1;
     }
     try {
+        platform::UseSystemCommandProcessor();
         const Ending ending = RunWatched(arguments);
         if (ending.text != nullptr) {
             Tell(ending.text);

@@ -4,6 +4,7 @@
 #include <memory>
 
 #include "installer/windows/EULAWindow.h"
+#include "platform/command_processor.h"
 #include "platform/utf8.h"
 #include "platform/windows/wtl.h"
 
@@ -28,7 +29,10 @@ void EULAWindowController::ShowAgreement() {
 
 void EULAWindowController::SaveAgreement(const std::string& text, const ATL::CWindow& viewer) {
     WTL::CFileDialog dialog(L"rtf", L"Halvorn Software License", kSaveFlags, viewer);
-    if (dialog.DoModal() == IDOK) {
+    const INT_PTR answer = dialog.DoModal();
+    // The dialogue makes the folder that the user looks into the current one, which may be anybody's.
+    platform::EnterSystemFolder();
+    if (answer == IDOK) {
         WriteAgreement(platform::Utf8FromWide(dialog.GetFilePath()), text);
     }
 }

@@ -8,6 +8,7 @@
 #include "installer/WinWizardController.h"
 #include "installer/windows/WindowSystem.h"
 #include "installer/windows/WindowsToolkit.h"
+#include "platform/command_processor.h"
 #include "platform/redirection_guard.h"
 #include "platform/windows/atl.h"
 #include "platform/windows/script_console.h"
@@ -54,6 +55,7 @@ int ShowWizard(HINSTANCE instance, int showCommand) {
 
 int RunWizard(HINSTANCE instance, int showCommand) {
     (void)platform::RefusePlantedJunctions();
+    platform::UseSystemCommandProcessor();
     platform::OpenMissingStandardStreams();
     PrepareConsoleForScripts();
     const WindowSystem windows;

@@ -73,7 +73,14 @@ std::string ScriptFile(std::string_view line) {
     return stat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode) ? path : std::string();
 }
 
-std::vector<std::string> Arguments(const std::string& line) {
+// A line that begins with two quotes and ends in one has a pair around the whole, which cmd takes off.
+std::string_view WithoutOuterQuotes(std::string_view line) {
+    const bool quoted = line.size() > 3 && line.starts_with("\"\"") && line.ends_with('"');
+    return quoted ? line.substr(1, line.size() - 2) : line;
+}
+
+std::vector<std::string> Arguments(std::string_view given) {
+    const std::string line(WithoutOuterQuotes(given));
     const std::string script = ScriptFile(line);
     if (!script.empty()) {
         return {"/bin/sh", "-c", RunFile, script};

@@ -6,7 +6,8 @@
 ///
 /// The command processor is /bin/sh. A line that is nothing but the quoted path of a file on the machine runs that
 /// file, as cmd would run a batch file: by /bin/sh, whether or not it has the execute bit, and with its host's name as
-/// `$0`. Any other line is handed to /bin/sh as it stands. The child works in this process's current directory, and
+/// `$0`. A line with one more pair of quotes around the whole (`""C:\a b\x.bat" y"`) loses that pair, as with cmd. Any
+/// other line is handed to /bin/sh as it stands. The child works in this process's current directory, and
 /// its environment is this process's with HV_MACHINE naming the machine's folder: a script reaches drive C as
 /// `$HV_MACHINE/drive_c`, and a program of this house that it starts works on the same machine. The machine's own
 /// variables (ProgramData and so on) are Windows paths, which a shell has no use for; they are not added.

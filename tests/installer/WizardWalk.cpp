@@ -12,6 +12,8 @@ WizardWalk::WizardWalk() {
 
 WizardWalk::~WizardWalk() {
     EndTheRun();
+    // An install makes a folder of its machine the current one.
+    fs::current_path(folder_);
     HV::InstallerModel::Forget();
 }
 

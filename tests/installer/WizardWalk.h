@@ -9,6 +9,7 @@
 #include "hvdeploy/src/DeployJob.h"
 #include "installer/InstallerModel.h"
 #include "installer/WinWizardController.h"
+#include "platform/filesystem.h"
 #include "tests/installer/HeldStreams.h"
 #include "tests/installer/ScriptedToolkit.h"
 #include "tests/support/LogRecorder.h"
@@ -87,4 +88,7 @@ protected:
     HeldOutput output;
     ScriptedToolkit toolkit;
     HV::WinWizardController wizard{toolkit};
+
+private:
+    fs::path folder_ = fs::current_path();
 };

@@ -126,6 +126,8 @@ TEST_F(AgreementTest, SavesTheBytesOfTheDocument) {
     EXPECT_GT(expected.size(), 1000U);
     EXPECT_TRUE(Eventually([&] { return machine().Content(R"(C:\Kept\Agreement.rtf)").size() == expected.size(); }));
     EXPECT_EQ(machine().Content(R"(C:\Kept\Agreement.rtf)"), expected);
+    // The dialogue had gone to the folder of the file.
+    EXPECT_EQ(wizard.CurrentFolder(), R"(C:\windows\system32)");
 }
 
 TEST_F(AgreementTest, AsksBeforeItReplacesAFile) {

@@ -207,6 +207,31 @@ TEST_F(InstallTest, ShowsHowFarItIs) {
     EXPECT_TRUE(Eventually([&] { return GetDlgItem(window, id::Close) != nullptr; }));
 }
 
+// A program of that name beside the release would come before the system's own.
+TEST_F(InstallTest, RunsScriptsInTheSystemsFolder) {
+    HasEveryHost();
+    HoldAtScript("requirements");
+    std::filesystem::current_path(folder);
+    RunningWizard wizard(folder);
+    GoToSelection(wizard);
+    const HWND window = wizard.Window();
+    EXPECT_EQ(wizard.CurrentFolder(), folder);
+    wizard.Press(window, id::Continue);
+    WaitUntilHeld();
+    EXPECT_EQ(wizard.CurrentFolder(), R"(C:\windows\system32)");
+    LetGo();
+    EXPECT_TRUE(Eventually([&] { return GetDlgItem(window, id::Close) != nullptr; }));
+    std::filesystem::current_path("C:\\");
+}
+
+TEST_F(InstallTest, RunsScriptsByTheSystemsOwnProcessorWhateverTheEnvironmentSays) {
+    HasEveryHost();
+    SetEnvironmentVariableA("COMSPEC", "Z:" HV_PROGRAM_FOLDER "/planted_program.exe");
+    RunningWizard wizard(folder);
+    GoToFinal(wizard);
+    EXPECT_FALSE(machine().HasFile(R"(C:\planted.txt)"));
+}
+
 TEST_F(InstallTest, EndsAtOnceWhenCancelledInTheMiddle) {
     HasEveryHost();
     HoldAtScript("requirements");

@@ -1,7 +1,12 @@
 #include "tests/wizard/RunningWizard.h"
 
+#include <winternl.h>
+
 #include <algorithm>
+#include <cstddef>
 #include <cstdlib>
+
+#include "platform/utf8.h"
 
 namespace {
 
@@ -125,6 +130,36 @@ std::optional<DWORD> RunningWizard::ExitStatus() {
         return std::nullopt;
     }
     return status;
+}
+
+namespace {
+
+/// What a process was started with and works in, as far as this file asks for it. The header of the system has no names
+/// for these fields.
+struct ProcessParameters {
+    std::byte before[0x38];
+    UNICODE_STRING currentFolder;
+};
+
+template <class Block>
+Block ReadFrom(HANDLE process, const void* place) {
+    Block block{};
+    EXPECT_TRUE(ReadProcessMemory(process, place, &block, sizeof block, nullptr)) << GetLastError();
+    return block;
+}
+
+}  // namespace
+
+std::string RunningWizard::CurrentFolder() const {
+    PROCESS_BASIC_INFORMATION known{};
+    EXPECT_GE(NtQueryInformationProcess(process_.hProcess, ProcessBasicInformation, &known, sizeof known, nullptr), 0);
+    const auto process = ReadFrom<PEB>(process_.hProcess, known.PebBaseAddress);
+    const auto parameters = ReadFrom<ProcessParameters>(process_.hProcess, process.ProcessParameters);
+    std::wstring folder(parameters.currentFolder.Length / sizeof(wchar_t), L'\0');
+    EXPECT_TRUE(ReadProcessMemory(process_.hProcess, parameters.currentFolder.Buffer, folder.data(),
+                                  parameters.currentFolder.Length, nullptr));
+    std::string text = platform::Utf8FromWide(folder);
+    return text.ends_with('\\') ? text.substr(0, text.size() - 1) : text;
 }
 
 std::vector<HWND> RunningWizard::TopWindows() const {

@@ -99,6 +99,8 @@ public:
     /// Waits for the end of the process, and gives its exit status.
     std::optional<DWORD> ExitStatus();
     [[nodiscard]] bool IsRunning() const;
+    /// The folder that is current in the wizard, without a separator at its end.
+    [[nodiscard]] std::string CurrentFolder() const;
     [[nodiscard]] DWORD Id() const { return process_.dwProcessId; }
 
 private:

@@ -1,5 +1,5 @@
-// A command processor that lets a test hold a run between two scripts. While C:\hold.txt names a part of the command
-// line, the command waits, two minutes at most; then the system's own processor runs it.
+// A command processor that lets a test hold a run between two scripts (CommandGate.h). While C:\hold.txt names a part
+// of the command line, the command waits, two minutes at most; then the system's own processor runs it.
 
 #include <windows.h>
 
@@ -46,7 +46,7 @@ int main() {
     for (int polls = 0; IsHeld(line) && polls < 6000; ++polls) {
         Sleep(20);
     }
-    std::string command = R"(C:\windows\system32\cmd.exe)" + Arguments(line);
+    std::string command = R"(C:\windows\system32\cmd-real.exe)" + Arguments(line);
     STARTUPINFOA start{};
     start.cb = sizeof start;
     PROCESS_INFORMATION process{};

@@ -201,11 +201,11 @@ void End(RunningWizard& wizard) {
 /// Releases without such a script run through.
 void HoldTheSampleRelease() {
     WriteFile(R"(C:\hold.txt)", "requirements");
-    SetEnvironmentVariableA("COMSPEC", "Z:" HV_PROGRAM_FOLDER "/script_gate.exe");
 }
 
 TEST(Tour, GoesFromTheFirstPageToTheLast) {
     HoldTheSampleRelease();
+    const CommandGate gate;
     RunningWizard wizard(Variable("HV_WALK_RELEASE"));
     for (const auto step : {Welcome, ReadTheAgreement, Agree, ChooseProducts, Install, End}) {
         step(wizard);

@@ -64,6 +64,7 @@ WizardTest::WizardTest() : folder(Variable("HV_WALK_RELEASE").empty() ? R"(C:\Re
 }
 
 void WizardTest::StartOver() {
+    gate_.reset();
     machine_.reset();
     machine_ = std::make_unique<Machine>();
     if (Variable("HV_WALK_RELEASE").empty()) {
@@ -97,7 +98,7 @@ void WizardTest::RemovePackage(const std::string& name) {
 
 void WizardTest::HoldAtScript(const std::string& part) {
     machine().Has(R"(C:\hold.txt)", part);
-    SetEnvironmentVariableA("COMSPEC", "Z:" HV_PROGRAM_FOLDER "/script_gate.exe");
+    gate_ = std::make_unique<CommandGate>();
 }
 
 void WizardTest::WaitUntilHeld() {

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "tests/support/Machine.h"
+#include "tests/wizard/CommandGate.h"
 #include "tests/wizard/RunningWizard.h"
 
 /// The identifiers of the wizard's controls.
@@ -83,6 +84,7 @@ protected:
 
 private:
     std::unique_ptr<Machine> machine_;
+    std::unique_ptr<CommandGate> gate_;
 };
 
 bool operator==(const RECT& one, const RECT& other);
