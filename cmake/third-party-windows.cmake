@@ -14,7 +14,8 @@ set(lib ${made}/lib)
 hv_third_party(zlib LINKS z)
 
 # Of the system's own, those that are loaded when they are called first, and what is called of them.
-hv_delayed_library(bcrypt bcrypt.dll BCryptCloseAlgorithmProvider BCryptGenRandom BCryptOpenAlgorithmProvider)
+hv_delayed_library(bcrypt bcrypt.dll BCryptCloseAlgorithmProvider BCryptCreateHash
+    BCryptDestroyHash BCryptFinishHash BCryptGenRandom BCryptHashData BCryptOpenAlgorithmProvider)
 hv_delayed_library(comctl32 COMCTL32.dll InitCommonControlsEx)
 # Windows keeps this one loaded, but it brings the common controls along, and these the look of windows.
 hv_delayed_library(comdlg32 comdlg32.dll GetSaveFileNameW)

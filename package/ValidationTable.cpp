@@ -20,4 +20,10 @@ void GetValidationInfo(const std::string& name, ValidationInfo& info) {
     }
 }
 
+std::string SecondDigestOf(const std::string& name) {
+    const auto digests = ReleaseDigests();
+    const auto found = std::ranges::find(digests, name, &ReleaseDigest::fileName);
+    return found == digests.end() ? std::string() : std::string(found->sha256);
+}
+
 }  // namespace HV

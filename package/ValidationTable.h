@@ -36,4 +36,17 @@ struct ValidationRow {
 /// The rows of this build, in table order.
 std::span<const ValidationRow> ValidationRows();
 
+/// A package's second digest, as it stands in the source. MD5 tells a broken file from a good one; that nobody has made
+/// another file for the same digest is what this one is for. The list stands beside the rows and names the same files.
+struct ReleaseDigest {
+    std::string_view fileName;
+    std::string_view sha256;  // of the whole package file: 64 hexadecimal digits, lower case
+};
+
+/// The second digests of this build.
+std::span<const ReleaseDigest> ReleaseDigests();
+
+/// The second digest of a file name, compared exactly; empty for a name that is not in the list.
+[[nodiscard]] std::string SecondDigestOf(const std::string& name);
+
 }  // namespace HV

@@ -17,9 +17,21 @@ using hosted::Descriptor;
 using hosted::Machine;
 using hosted::Operation;
 
+bool IsSameTime(const timespec& one, const timespec& other) {
+    return one.tv_sec == other.tv_sec && one.tv_nsec == other.tv_nsec;
+}
+
+// The time of the last change of any kind cannot be put back, as that of the last writing can.
+bool IsSameState(const struct stat& one, const struct stat& other) {
+    return one.st_dev == other.st_dev && one.st_ino == other.st_ino && one.st_size == other.st_size &&
+           IsSameTime(one.st_mtim, other.st_mtim) && IsSameTime(one.st_ctim, other.st_ctim);
+}
+
 class HostFile : public RawFile {
 public:
-    HostFile(Descriptor descriptor, std::string name) : descriptor_(std::move(descriptor)), name_(std::move(name)) {}
+    HostFile(Descriptor descriptor, std::string name) : descriptor_(std::move(descriptor)), name_(std::move(name)) {
+        ::fstat(descriptor_.Get(), &opened_);
+    }
 
     std::int64_t ReadAt(std::uint64_t place, void* bytes, std::size_t count) override {
         std::size_t done = 0;
@@ -58,11 +70,18 @@ public:
         return ::fstat(descriptor_.Get(), &found) == 0 ? static_cast<std::uint64_t>(found.st_size) : 0;
     }
 
+    [[nodiscard]] bool IsStillAt(const wchar_t* name) const override {
+        struct stat now {};
+        const std::string hostName = Machine::Current().HostPath(std::wstring_view(name));
+        return ::stat(hostName.c_str(), &now) == 0 && IsSameState(now, opened_);
+    }
+
     bool Close() override { return descriptor_.Close() == 0; }
 
 private:
     Descriptor descriptor_;
     std::string name_;
+    struct stat opened_ {};
 };
 
 bool IsReadOnly(const std::string& name) {

@@ -17,9 +17,15 @@ OVERLAPPED At(std::uint64_t place) {
     return overlapped;
 }
 
+bool IsSameState(const BY_HANDLE_FILE_INFORMATION& one, const BY_HANDLE_FILE_INFORMATION& other) {
+    return one.dwVolumeSerialNumber == other.dwVolumeSerialNumber && one.nFileIndexHigh == other.nFileIndexHigh &&
+           one.nFileIndexLow == other.nFileIndexLow && one.nFileSizeHigh == other.nFileSizeHigh &&
+           one.nFileSizeLow == other.nFileSizeLow && CompareFileTime(&one.ftLastWriteTime, &other.ftLastWriteTime) == 0;
+}
+
 class WindowsFile : public RawFile {
 public:
-    explicit WindowsFile(HANDLE handle) : handle_(handle) {}
+    explicit WindowsFile(HANDLE handle) : handle_(handle) { GetFileInformationByHandle(handle_, &opened_); }
     ~WindowsFile() override { WindowsFile::Close(); }
 
     std::int64_t ReadAt(std::uint64_t place, void* bytes, std::size_t count) override {
@@ -59,6 +65,19 @@ public:
         return GetFileSizeEx(handle_, &size) ? static_cast<std::uint64_t>(size.QuadPart) : 0;
     }
 
+    [[nodiscard]] bool IsStillAt(const wchar_t* name) const override {
+        const HANDLE found =
+            CreateFileW(name, FILE_READ_ATTRIBUTES, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
+                        OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+        if (found == INVALID_HANDLE_VALUE) {
+            return false;
+        }
+        BY_HANDLE_FILE_INFORMATION now{};
+        const bool known = GetFileInformationByHandle(found, &now) != FALSE;
+        CloseHandle(found);
+        return known && IsSameState(now, opened_);
+    }
+
     bool Close() override {
         const HANDLE handle = handle_;
         handle_ = INVALID_HANDLE_VALUE;
@@ -67,6 +86,7 @@ public:
 
 private:
     HANDLE handle_;
+    BY_HANDLE_FILE_INFORMATION opened_{};
 };
 
 }  // namespace

@@ -19,6 +19,11 @@ std::span<const HV::ValidationRow> HV::ValidationRows() {
     return kRows;
 }
 
+std::span<const HV::ReleaseDigest> HV::ReleaseDigests() {
+    static constexpr std::array<HV::ReleaseDigest, 1> kDigests{{{"com.halvorn.glow.zip", "ab12"}}};
+    return kDigests;
+}
+
 namespace {
 
 TEST(ReleaseRows, NamesComeInTableOrder) {
@@ -26,6 +31,13 @@ TEST(ReleaseRows, NamesComeInTableOrder) {
     HV::GetValidationFileNames(names);
     EXPECT_EQ(names,
               (std::vector<std::string>{"com.halvorn.glow.zip", "com.halvorn.core.zip", "com.halvorn.blur.zip"}));
+}
+
+TEST(ReleaseRows, SecondDigestsStandByTheirNames) {
+    EXPECT_EQ(HV::SecondDigestOf("com.halvorn.glow.zip"), "ab12");
+    for (const char* name : {"com.halvorn.core.zip", "com.halvorn.Glow.zip", "com.halvorn.glow", ""}) {
+        EXPECT_EQ(HV::SecondDigestOf(name), "") << name;
+    }
 }
 
 TEST(ReleaseRows, AKnownNameFillsTheWholeRecord) {

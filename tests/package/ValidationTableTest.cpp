@@ -19,4 +19,8 @@ TEST(ValidationTable, OfABuildWithoutReleaseRowsLeavesTheRecordAlone) {
     EXPECT_EQ(info.md5, "digest");
 }
 
+TEST(ValidationTable, OfABuildWithoutReleaseRowsHasNoSecondDigests) {
+    EXPECT_EQ(HV::SecondDigestOf("com.halvorn.glow.zip"), "");
+}
+
 }  // namespace

@@ -8,6 +8,7 @@
 
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
+#include "package/HeldFile.h"
 #include "package/Package.h"
 #include "package/ValidationTable.h"
 #include "tests/support/Machine.h"
@@ -111,6 +112,18 @@ TEST_F(ReleaseTest, HasTheDigestOfEachPackageFileInLowerCase) {
         const std::string digest = Row(name).md5;
         EXPECT_EQ(digest, HVL::FileUtils::GetFileMD5(Path(name))) << name;
         EXPECT_EQ(digest.size(), 32U);
+        EXPECT_EQ(digest.find_first_not_of("0123456789abcdef"), std::string::npos) << digest;
+        digests.insert(digest);
+    }
+    EXPECT_EQ(digests.size(), kPackageCount);
+}
+
+TEST_F(ReleaseTest, HasTheSecondDigestOfEachPackageFileInLowerCase) {
+    std::set<std::string> digests;
+    for (const std::string& name : names) {
+        const std::string digest = HV::SecondDigestOf(name);
+        EXPECT_EQ(digest, HV::HeldFile(fs::path(Path(name))).Digests().sha256) << name;
+        EXPECT_EQ(digest.size(), 64U);
         EXPECT_EQ(digest.find_first_not_of("0123456789abcdef"), std::string::npos) << digest;
         digests.insert(digest);
     }

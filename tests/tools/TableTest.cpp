@@ -5,6 +5,7 @@
 #include <sstream>
 
 #include "hvframework/FileUtils.h"
+#include "package/HeldFile.h"
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
 #include "tools/hvpack/Commands.h"
@@ -78,6 +79,20 @@ TEST_F(TableTest, HasARowForEachPackageSortedByFileName) {
                           Row(R"("com.halvorn.glow.hvpkg", "glow", "com.halvorn.glow", "2.0.1")", glow));
     EXPECT_NE(out.find("std::array<HV::ValidationRow, 3> kRows"), std::string::npos) << out;
     EXPECT_EQ(err, "");
+}
+
+TEST_F(TableTest, HasASecondDigestForEachPackageInTheSameOrder) {
+    const fs::path glow = Ships(Product("glow"));
+    const fs::path core = Ships(Product("core").Named("b.zip"));
+    ASSERT_EQ(Table(), 0) << err;
+    EXPECT_NE(out.find("constexpr std::array<HV::ReleaseDigest, 2> kDigests{{\n"
+                       "    {\"b.zip\",\n     \"" +
+                       HV::HeldFile(core).Digests().sha256 +
+                       "\"},\n"
+                       "    {\"com.halvorn.glow.hvpkg\",\n     \"" +
+                       HV::HeldFile(glow).Digests().sha256 + "\"},\n}};\n"),
+              std::string::npos)
+        << out;
 }
 
 TEST_F(TableTest, CallsAPackageThatIsNotShownNone) {
@@ -155,6 +170,7 @@ TEST_F(TableTest, KeepsOddTextsThroughTheCompiler) {
     EXPECT_EQ(info.displayName, kOddName);
     EXPECT_EQ(info.productId, "com.halvorn.\"odd\"");
     EXPECT_EQ(info.version, kOddVersion);
+    EXPECT_EQ(HV::SecondDigestOf(kOddFile).size(), 64U);
 }
 
 TEST_F(TableTest, EscapesEveryByteThatIsNoPlainCharacter) {
@@ -163,7 +179,7 @@ TEST_F(TableTest, EscapesEveryByteThatIsNoPlainCharacter) {
                                  "1\n\t\x7F\xFF",
                                  7) +
                              "9~ ";
-    const std::string source = HVPack::TableSource({{"x.zip", {text, "id", "1.0", "0"}}});
+    const std::string source = HVPack::TableSource({{"x.zip", {text, "id", "1.0", "0"}, "1"}});
     EXPECT_NE(source.find(R"({"x.zip", "a\0001\012\011\177\3779~ ", "id", "1.0",)"), std::string::npos) << source;
 }
 

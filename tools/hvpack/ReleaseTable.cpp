@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "hvframework/FileUtils.h"
+#include "package/HeldFile.h"
 #include "platform/win32.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/SoundPackage.h"
@@ -28,6 +29,10 @@ constexpr std::string_view kFoot =
     "\n"
     "std::span<const HV::ValidationRow> HV::ValidationRows() {\n"
     "    return kRows;\n"
+    "}\n"
+    "\n"
+    "std::span<const HV::ReleaseDigest> HV::ReleaseDigests() {\n"
+    "    return kDigests;\n"
     "}\n";
 
 std::string FileName(const fs::path& path) {
@@ -89,6 +94,15 @@ std::string RowSource(const ReleaseRow& row) {
            ", " + Literal(row.info.version) + ",\n     " + Literal(row.info.md5) + "},\n";
 }
 
+std::string DigestSource(const ReleaseRow& row) {
+    return "    {" + Literal(row.fileName) + ",\n     " + Literal(row.sha256) + "},\n";
+}
+
+/// `count` elements of HV::`type`, ready for their list.
+std::string ArrayHead(const std::string& type, const std::string& name, std::size_t count) {
+    return "constexpr std::array<HV::" + type + ", " + std::to_string(count) + "> " + name + "{{\n";
+}
+
 bool WriteFile(const fs::path& path, const std::string& text) {
     std::FILE* file = nullptr;
     if (fopen_s(&file, path.string().c_str(), "wb") != 0) {
@@ -120,16 +134,21 @@ std::vector<fs::path> PackagesIn(const fs::path& folder) {
 
 ReleaseRow RowOf(const fs::path& package) {
     const HV::Manifest manifest = SoundPackage(package.string()).manifest;
+    const HV::FileDigests digests = HV::HeldFile(package).Digests();
     return {FileName(package),
-            {DisplayName(manifest), manifest.productId, manifest.productVersion,
-             HVL::FileUtils::GetFileMD5(package.string())}};
+            {DisplayName(manifest), manifest.productId, manifest.productVersion, digests.md5},
+            digests.sha256};
 }
 
 std::string TableSource(const std::vector<ReleaseRow>& rows) {
     std::string source(kHead);
-    source += "constexpr std::array<HV::ValidationRow, " + std::to_string(rows.size()) + "> kRows{{\n";
+    source += ArrayHead("ValidationRow", "kRows", rows.size());
     for (const ReleaseRow& row : rows) {
         source += RowSource(row);
+    }
+    source += "}};\n\n" + ArrayHead("ReleaseDigest", "kDigests", rows.size());
+    for (const ReleaseRow& row : rows) {
+        source += DigestSource(row);
     }
     return source.append(kFoot);
 }

@@ -7,7 +7,7 @@
 #include "platform/filesystem.h"
 
 /// The build validation table of a release, made from its package files: a C++ source that defines
-/// HV::ValidationRows(), for the programs that are to know these packages.
+/// HV::ValidationRows() and HV::ReleaseDigests(), for the programs that are to know these packages.
 ///
 /// The same packages give the same source, whatever folder they lie in.
 namespace HVPack {
@@ -15,6 +15,7 @@ namespace HVPack {
 struct ReleaseRow {
     std::string fileName;
     HV::ValidationInfo info;
+    std::string sha256;
 };
 
 /// The packages directly in `folder`, sorted by file name; other files are passed over, as the installer does. One that

@@ -1,0 +1,10 @@
+#include "package/ValidationTable.h"
+
+namespace HV {
+
+// A build without release rows; see ValidationRows.cpp.
+std::span<const ReleaseDigest> ReleaseDigests() {
+    return {};
+}
+
+}  // namespace HV
