@@ -1,10 +1,12 @@
 #pragma once
 
+#include <set>
 #include <string>
 #include <vector>
 
 #include "hosts/HostAppCheck.h"
 #include "hvframework/ProductData.h"
+#include "package/HeldFile.h"
 #include "system/Processes.h"
 #include "system/XMLStringsResource.h"
 
@@ -56,6 +58,13 @@ public:
     /// new snapshot unless no package uses a host.
     [[nodiscard]] bool FindRunningHosts(std::vector<ProcessRecord>& out);
 
+    /// Whether the packages folder holds, of all that the engine would read, what was there when it was scanned, and
+    /// nothing else. The first thing that is otherwise is logged, and ends the look.
+    [[nodiscard]] bool PackagesAreUntouched() const;
+
+    /// The names of all files of the packages folder that the engine may read.
+    [[nodiscard]] std::set<std::string> NamesOfRelease() const;
+
     bool valid = false;  // the folder was scanned and every package is good
     std::string packagesDirectory;
     std::vector<std::string> packageFiles;  // full paths, in directory order
@@ -73,7 +82,12 @@ private:
     void Load();
     [[nodiscard]] bool ScanPackages();
     [[nodiscard]] bool ValidatePackages();
+    void HoldSuites();
+    [[nodiscard]] bool IsReleased(const std::string& path, const std::set<std::string>& releasedNames);
     void LoadStringsResource();
+
+    // Every file of the release, held from before it is tested until the process ends.
+    std::vector<HeldFile> held_;
 };
 
 }  // namespace HV

@@ -18,7 +18,6 @@
 namespace HV {
 namespace {
 
-using HVL::FileUtils::GetFileMD5;
 using HVL::FileUtils::GetFileName;
 
 /// What the walk over the packages folder finds.
@@ -26,6 +25,18 @@ struct FolderFiles {
     std::vector<std::string> packageFiles;
     std::string suiteJsonPath;
 };
+
+std::string InLowerCase(std::string text) {
+    std::ranges::transform(text, text.begin(),
+                           [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; });
+    return text;
+}
+
+// The engine passes over the case of an extension.
+bool IsReadByEngine(const fs::path& path) {
+    const std::string extension = InLowerCase(path.extension().string());
+    return extension == ".zip" || extension == ".hvpkg" || extension == ".json";
+}
 
 // The case of an extension counts here, though the engine passes over it: the name of a package has to stand in the
 // table of this build, to the letter.
@@ -40,18 +51,27 @@ void AddFile(const fs::path& path, FolderFiles& files) {
     }
 }
 
-/// Lists the files directly in the folder; whether it could be listed to its end.
-bool ListFolder(const std::string& folder, FolderFiles& files) {
+/// Hands every regular file directly in the folder to `take`; whether the folder could be listed to its end.
+template <class Take>
+bool ListFolder(const std::string& folder, Take take) {
     boost::system::error_code error;
     fs::directory_iterator entry(fs::path(folder), error);
     while (!error && entry != fs::directory_iterator()) {
         boost::system::error_code unknown;
         if (fs::is_regular_file(entry->status(unknown))) {
-            AddFile(entry->path(), files);
+            take(entry->path());
         }
         entry.increment(error);
     }
     return !error;
+}
+
+void LogStranger(const std::string& name) {
+    HVL_LOG(Error, "ERROR: " << name << " is not valid payload.");
+}
+
+void LogSpoiled(const std::string& name) {
+    HVL_LOG(Error, "validation of " << name << " failed.");
 }
 
 // JSON that is no object throws; for the user of the wizard it is a suite file that cannot be read, like any other.
@@ -70,22 +90,6 @@ bool ReadSuite(const std::string& path, HVL::ProductData& suite) {
     }
     if (!ParseSuite(json, suite)) {
         std::cerr << "ERROR: failed to read suite data from file " << path << std::endl;
-        return false;
-    }
-    return true;
-}
-
-/// Whether the file is one of this release, byte for byte.
-bool IsReleased(const std::string& path, const std::set<std::string>& releasedNames) {
-    const std::string name = GetFileName(path);
-    if (!releasedNames.contains(name)) {
-        HVL_LOG(Error, "ERROR: " << name << " is not valid payload.");
-        return false;
-    }
-    ValidationInfo row;
-    GetValidationInfo(name, row);
-    if (GetFileMD5(path) != row.md5) {
-        HVL_LOG(Error, "validation of " << name << " failed.");
         return false;
     }
     return true;
@@ -175,13 +179,41 @@ void SortForDisplay(std::vector<PackageInfo>& packages) {
 bool InstallerModel::ScanPackages() {
     packagesDirectory = PackagesDirectoryPath();
     FolderFiles files;
-    if (!HVL::FileUtils::DirectoryExists(packagesDirectory) || !ListFolder(packagesDirectory, files)) {
+    const auto add = [&](const fs::path& path) { AddFile(path, files); };
+    if (!HVL::FileUtils::DirectoryExists(packagesDirectory) || !ListFolder(packagesDirectory, add)) {
         return false;
     }
     packageFiles = std::move(files.packageFiles);
     suiteJsonPath = std::move(files.suiteJsonPath);
+    HoldSuites();
     // The suite is read even where there is no package: its name stands in the window that says so.
     return ReadSuite(suiteJsonPath, suite) && !packageFiles.empty();
+}
+
+// Before the first is read. The engine reads one of them too, and which one is the system's order.
+void InstallerModel::HoldSuites() {
+    (void)ListFolder(packagesDirectory, [this](const fs::path& path) {
+        if (InLowerCase(path.extension().string()) == ".json") {
+            held_.emplace_back(path);
+        }
+    });
+}
+
+/// Whether the file is one of this release, byte for byte. From before its bytes are read it is held.
+bool InstallerModel::IsReleased(const std::string& path, const std::set<std::string>& releasedNames) {
+    const std::string name = GetFileName(path);
+    if (!releasedNames.contains(name)) {
+        LogStranger(name);
+        return false;
+    }
+    ValidationInfo row;
+    GetValidationInfo(name, row);
+    const FileDigests released{row.md5, SecondDigestOf(name)};
+    if (held_.emplace_back(fs::path(path)).Digests() != released) {
+        LogSpoiled(name);
+        return false;
+    }
+    return true;
 }
 
 // The first bad file ends it, and then there is no list of packages at all: the wizard offers all of a release or none.
@@ -204,6 +236,34 @@ bool InstallerModel::ValidatePackages() {
     SortForDisplay(good);
     packages = std::move(good);
     return true;
+}
+
+std::set<std::string> InstallerModel::NamesOfRelease() const {
+    std::set<std::string> names;
+    for (const HeldFile& file : held_) {
+        names.insert(file.Path().filename().string());
+    }
+    return names;
+}
+
+// A file that the scan has passed over because of its case is no more a part of the release than one that came later.
+bool InstallerModel::PackagesAreUntouched() const {
+    const std::set<std::string> known = NamesOfRelease();
+    std::vector<std::string> strangers;
+    const bool listed = ListFolder(packagesDirectory, [&](const fs::path& path) {
+        if (IsReadByEngine(path) && !known.contains(path.filename().string())) {
+            strangers.push_back(path.filename().string());
+        }
+    });
+    if (!strangers.empty()) {
+        LogStranger(strangers.front());
+        return false;
+    }
+    const auto touched = std::ranges::find_if_not(held_, &HeldFile::IsUntouched);
+    if (touched != held_.end()) {
+        LogSpoiled(touched->Path().filename().string());
+    }
+    return listed && touched == held_.end();
 }
 
 }  // namespace HV

@@ -31,8 +31,7 @@ void WinWizardController::MakeWindow(const std::string& caption, int showCommand
 void WinWizardController::CheckPackagesAndHosts() {
     const InstallerModel& model = InstallerModel::Instance();
     if (!model.valid) {
-        EndWith(nullptr, "Error: invalid installer packages.",
-                "This installer contains invalid packages and cannot be run.");
+        EndWithInvalidPackages();
     }
     if (model.AllProductsLackHosts()) {
         EndWith(nullptr, "Error: no hosts found.",
@@ -49,6 +48,11 @@ void WinWizardController::CheckPackagesAndHosts() {
 
 const char* WinWizardController::FirstContinueText() const {
     return hasProductChoice ? "Continue" : "Install";
+}
+
+void WinWizardController::EndWithInvalidPackages() {
+    EndWith(nullptr, "Error: invalid installer packages.",
+            "This installer contains invalid packages and cannot be run.");
 }
 
 // Status 0 says that the wizard itself did its part, whatever it had to tell.

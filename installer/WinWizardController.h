@@ -80,6 +80,7 @@ private:
     // The install.
     void CreateInstallingPage();
     void StartInstall();
+    void RefuseWhatHasChanged();
     void ShowPercent(std::uint32_t percent);
     void ShowStatus(const std::string& text);
     void ShowFinalPage();
@@ -89,6 +90,7 @@ private:
     void OpenResources();
     void OpenUrl(const std::string& url);
 
+    [[noreturn]] void EndWithInvalidPackages();
     [[noreturn]] void EndWith(InstallerWindow* owner, const std::string& title, const std::string& text);
     [[nodiscard]] const char* FirstContinueText() const;
 

@@ -56,15 +56,24 @@ void WinWizardController::CreateInstallingPage() {
     installingPage = toolkit_.CreateInstallingPage(*this, *window, "Detecting host applications...", 0);
 }
 
+// Minutes may have gone by since the packages were tested.
+void WinWizardController::RefuseWhatHasChanged() {
+    if (!InstallerModel::Instance().PackagesAreUntouched()) {
+        EndWithInvalidPackages();
+    }
+}
+
 // Packages that the user does not see are not on the page, so the line never skips them.
 void WinWizardController::StartInstall() {
     // Where the wizard was started is where the release lies, often a folder of downloads: no script is to find its
     // programs there. All paths of the line are whole ones.
     platform::EnterSystemFolder();
     const InstallerModel& model = InstallerModel::Instance();
+    RefuseWhatHasChanged();
     job =
         KeptJob(InstallLine({toolkit_.UncheckedIdentifiers(*selectionPage), LogPathPrefix(model.suite.GetIdentifier()),
                              std::time(nullptr), model.packagesDirectory}));
+    job->AcceptOnly(model.NamesOfRelease());
     job->Start();
     toolkit_.SetTimer(*window, kProgressTimer, kMillisecondsBetweenPolls);
 }

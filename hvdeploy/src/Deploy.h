@@ -3,6 +3,8 @@
 #include <boost/thread/mutex.hpp>
 #include <cstdint>
 #include <map>
+#include <optional>
+#include <set>
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -93,6 +95,10 @@ public:
     /// The share of one package in the 90 points that packages have, by the size of its file.
     float PackageProgressPoints(const fs::path& path) const;
 
+    /// Lets a folder be installed from only when all that is read of it are files of these names. Another one fails the
+    /// run before anything is done.
+    void AcceptOnly(std::set<std::string> fileNames) { acceptedNames = std::move(fileNames); }
+
     void SetVerbose(bool on);
     void SetLegacyUninstall(bool on) { legacyUninstall = on; }
     void SetFatalErrorTest(bool on) { fatalErrorTest = on; }
@@ -113,10 +119,12 @@ private:
         std::vector<fs::path> postflightPackages;
         std::vector<fs::path> synthesisPackages;
         fs::path suitePath;
+        bool hasStranger = false;
     };
 
     // The run over a folder.
     FolderContent ScanFolder(const fs::path& dir);
+    [[nodiscard]] bool IsAccepted(const fs::path& file) const;
     void AddPackageFile(const fs::path& path, FolderContent& content);
     void ReadSuiteInfo(const FolderContent& content);
     bool ReadSuiteFile(const fs::path& suitePath);
@@ -184,6 +192,7 @@ private:
     std::vector<Package> deployedPackages;
     HVL::TempFolder packageFolder;  // where the package that is being placed is unpacked
     std::vector<std::string> skipList;
+    std::optional<std::set<std::string>> acceptedNames;  // all are, unless somebody has said which
     std::map<std::string, ValidationInfo> validationInfo;
     std::uint64_t totalPackageBytes = 0;
     ProgressListenerInterface* listener;

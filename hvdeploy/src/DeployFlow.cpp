@@ -30,6 +30,10 @@ bool IsPackageExtension(const std::string& extension) {
     return extension == ".zip" || extension == ".hvpkg";
 }
 
+bool IsRead(const std::string& extension) {
+    return IsPackageExtension(extension) || extension == ".json";
+}
+
 // A suite in a test phase says so in its name.
 std::string SuiteDisplayName(const std::string& identifier, std::string displayName) {
     if (displayName.empty()) {
@@ -89,6 +93,9 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
         return kPlacementFailed;
     }
     const FolderContent content = ScanFolder(dir);
+    if (content.hasStranger) {
+        return kPlacementFailed;
+    }
     ReadSuiteInfo(content);
 
     const EngineResult preflightResult = RunPreflightPhase(content.preflightPackages);
@@ -114,7 +121,9 @@ Deploy::FolderContent Deploy::ScanFolder(const fs::path& dir) {
         }
         const fs::path& path = entry.path();
         const std::string extension = ToLower(path.extension().string());
-        if (IsPackageExtension(extension)) {
+        if (IsRead(extension) && !IsAccepted(path)) {
+            content.hasStranger = true;
+        } else if (IsPackageExtension(extension)) {
             AddPackageFile(path, content);
         } else if (extension == ".json" && content.suitePath.empty()) {
             HVL_LOG(Debug, "Located suite .json file...");
@@ -124,6 +133,16 @@ Deploy::FolderContent Deploy::ScanFolder(const fs::path& dir) {
         }
     }
     return content;
+}
+
+// Which files a release consists of is known to whoever has tested it; what has come since is none of them.
+bool Deploy::IsAccepted(const fs::path& file) const {
+    const std::string name = file.filename().string();
+    if (!acceptedNames || acceptedNames->contains(name)) {
+        return true;
+    }
+    HVL_LOG(Error, "ERROR: " << name << " is not valid payload.");
+    return false;
 }
 
 // Packages to skip are listed and counted like all others and fall out later, so the percentages do not depend on them.

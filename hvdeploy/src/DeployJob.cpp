@@ -35,6 +35,9 @@ DeployJob::~DeployJob() = default;
 void DeployJob::Start() {
     cli.reset();
     cli = std::make_unique<DeployCLI>(this);
+    if (acceptedNames_) {
+        cli->Engine().AcceptOnly(*acceptedNames_);
+    }
     thread = StartThread(boost::bind(&RunLine, cli.get(), commandLine));
 }
 

@@ -2,6 +2,8 @@
 
 #include <boost/thread/thread.hpp>
 #include <memory>
+#include <optional>
+#include <set>
 #include <string>
 
 #include "hvdeploy/src/HVDeployCLI.h"
@@ -17,6 +19,10 @@ class DeployJob : public ProgressListener {
 public:
     explicit DeployJob(std::string commandLine);
 
+    /// Before Start(): lets the line's folder be installed from only when all that is read of it are files of these
+    /// names.
+    void AcceptOnly(std::set<std::string> fileNames) { acceptedNames_ = std::move(fileNames); }
+
     /// Deletes the front end, and leaves the thread as it is.
     ~DeployJob() override;
 
@@ -28,6 +34,9 @@ public:
     std::unique_ptr<DeployCLI> cli;
     /// Lives as long as the process and is joined by nobody: the end of the process ends the thread.
     boost::thread* thread = nullptr;
+
+private:
+    std::optional<std::set<std::string>> acceptedNames_;
 };
 
 }  // namespace HV

@@ -4,8 +4,8 @@
 #include <utility>
 #include <vector>
 
-#include "hvframework/FileUtils.h"
 #include "installer/InstallerModel.h"
+#include "package/HeldFile.h"
 #include "package/ValidationTable.h"
 
 namespace {
@@ -13,6 +13,7 @@ namespace {
 /// The texts of the table, which stay where they are when it grows.
 std::deque<std::string> texts;
 std::vector<HV::ValidationRow> table;
+std::vector<HV::ReleaseDigest> digests;
 std::function<void()> whenAsked;
 
 const std::string& Keep(const std::string& text) {
@@ -28,6 +29,10 @@ std::span<const HV::ValidationRow> HV::ValidationRows() {
     return table;
 }
 
+std::span<const HV::ReleaseDigest> HV::ReleaseDigests() {
+    return digests;
+}
+
 std::string InPackages(const std::string& fileName) {
     return std::string(kPackages) + "\\" + fileName;
 }
@@ -38,12 +43,14 @@ SetupFolder::~SetupFolder() {
     HV::InstallerModel::Forget();
     whenAsked = nullptr;
     table.clear();
+    digests.clear();
     texts.clear();
 }
 
 std::string SetupFolder::Ships(const PackageBuilder& package) {
     std::string name = Has(package);
-    Knows(name, HVL::FileUtils::GetFileMD5(InPackages(name)));
+    const HV::FileDigests known = HV::HeldFile(fs::path(InPackages(name))).Digests();
+    Knows(name, known.md5, known.sha256);
     return name;
 }
 
@@ -55,8 +62,9 @@ void SetupFolder::HasSuite(const std::string& json, const std::string& fileName)
     machine_.Has(InPackages(fileName), json);
 }
 
-void SetupFolder::Knows(const std::string& fileName, const std::string& md5) {
+void SetupFolder::Knows(const std::string& fileName, const std::string& md5, const std::string& sha256) {
     table.push_back({Keep(fileName), "None", "", "", Keep(md5)});
+    digests.push_back({Keep(fileName), Keep(sha256)});
 }
 
 void SetupFolder::WhenTheTableIsAsked(std::function<void()> action) {

@@ -30,8 +30,9 @@ public:
     void HasSuite(const std::string& json = R"({"identifier": "com.halvorn.suite", "version": "4.2.0",)"
                                             R"( "display_name": "Tessaly Suite", "product_type": "0"})",
                   const std::string& fileName = "suite.json");
-    /// Another row of the table.
-    void Knows(const std::string& fileName, const std::string& md5);
+    /// Another row of the table, and its second digest: the one of no bytes unless it is given.
+    void Knows(const std::string& fileName, const std::string& md5,
+               const std::string& sha256 = "e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855");
     /// What happens, once, when the table is next asked for: behind the listing of the folder, ahead of the look at its
     /// packages.
     void WhenTheTableIsAsked(std::function<void()> action);

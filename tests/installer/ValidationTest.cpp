@@ -1,5 +1,9 @@
 // The test of the packages list: what a release may hold, and what stands in the wizard's list afterwards.
+#include <algorithm>
+
 #include "hvframework/Md5.h"
+#include "package/HeldFile.h"
+#include "platform/sha256.h"
 #include "tests/installer/ModelTest.h"
 
 namespace {
@@ -127,7 +131,9 @@ TEST_F(ValidationTest, ABrokenArchiveIsRefusedThoughItsDigestIsRight) {
     machine.Has(InPackages("broken.hvpkg"), bytes);
     HVL::Md5 md5;
     md5.Update(bytes.data(), bytes.size());
-    setup.Knows("broken.hvpkg", md5.Finish());
+    platform::Sha256 sha256;
+    sha256.Update(bytes.data(), bytes.size());
+    setup.Knows("broken.hvpkg", md5.Finish(), sha256.Finish());
     ExpectRefused(DetailError("ReadZipEntries failed for broken.hvpkg"));
 }
 
@@ -135,6 +141,29 @@ TEST_F(ValidationTest, APackageWithoutAPayloadsSourceIsRefusedThoughItsDigestIsR
     setup.Ships(PackageBuilder("com.halvorn.glow").Payload("plugin").Source("not there"));
     ExpectRefused(DetailError(
         "Error in package com.halvorn.glow.hvpkg- cannot find source for payload payload-1, source not there"));
+}
+
+// Whoever can make another file for an MD5 cannot make it for both.
+TEST_F(ValidationTest, APackageIsRefusedWhoseFirstDigestAloneIsRight) {
+    const std::string name = setup.Has(Product("glow"));
+    const HV::FileDigests digests = HV::HeldFile(fs::path(InPackages(name))).Digests();
+    setup.Knows(name, digests.md5, std::string(64, '0'));
+    ExpectRefused(DetailError("validation of com.halvorn.glow.hvpkg failed."));
+}
+
+TEST_F(ValidationTest, APackageIsRefusedThatHasNoSecondDigest) {
+    const std::string name = setup.Has(Product("glow"));
+    setup.Knows(name, HV::HeldFile(fs::path(InPackages(name))).Digests().md5, "");
+    ExpectRefused(DetailError("validation of com.halvorn.glow.hvpkg failed."));
+}
+
+TEST_F(ValidationTest, APackageIsRefusedWhoseSecondDigestIsInUpperCase) {
+    const std::string name = setup.Has(Product("glow"));
+    HV::FileDigests digests = HV::HeldFile(fs::path(InPackages(name))).Digests();
+    std::ranges::transform(digests.sha256, digests.sha256.begin(),
+                           [](char c) { return c >= 'a' ? static_cast<char>(c - 'a' + 'A') : c; });
+    setup.Knows(name, digests.md5, digests.sha256);
+    ExpectRefused(DetailError("validation of com.halvorn.glow.hvpkg failed."));
 }
 
 TEST_F(ValidationTest, APackageThatGoesBehindTheScanIsRefused) {

@@ -217,41 +217,6 @@ TEST_F(FailingInstall, PassesForASuccessAtThePollThatLandsOnAHundred) {
     EXPECT_TRUE(toolkit.boxes.empty());
 }
 
-TEST_F(FailingInstall, EndsWhenThePackagesFolderHasGone) {
-    GoToSelection();
-    RemovePackagesFolder();
-    Install();
-    WaitForJob();
-    toolkit.AnswerNext(kOk);
-    TickToTheEnd();
-    EXPECT_EQ(toolkit.boxes, std::vector{kInstallationFailed});
-    EXPECT_EQ(machine.Content(PlaceOf("glow")), "the old one");
-}
-
-TEST_F(FailingInstall, EndsWhenThePackagesFolderGoesAfterTheEngineHasStarted) {
-    GoToSelection();
-    output.gate.HoldAt("hvdeploy version");
-    Install();
-    ASSERT_TRUE(output.gate.WaitUntilHeld());
-    RemovePackagesFolder();
-    EndTheRun();
-    toolkit.AnswerNext(kOk);
-    TickToTheEnd();
-    EXPECT_EQ(toolkit.boxes, std::vector{kInstallationFailed});
-    EXPECT_EQ(toolkit.Installing().status, kFailureText);
-    EXPECT_EQ(machine.Content(PlaceOf("glow")), "the old one");
-}
-
-TEST_F(FailingInstall, EndsWhenAPackageHasBeenSpoiledSinceTheStart) {
-    GoToSelection();
-    machine.Has(InPackages("com.halvorn.glow.hvpkg"), "no archive");
-    Install();
-    WaitForJob();
-    toolkit.AnswerNext(kOk);
-    TickToTheEnd();
-    EXPECT_EQ(toolkit.boxes, std::vector{kInstallationFailed});
-}
-
 /// An install that stands still between its two payloads, the first of which has replaced a file.
 class CancelledInstall : public WizardTest {
 protected:
