@@ -2,6 +2,8 @@
 // C:\planted.txt to be written, or a file of his own to be installed.
 #include <algorithm>
 #include <cctype>
+#include <filesystem>
+#include <system_error>
 
 #include "hvframework/FileUtils.h"
 #include "tests/installer/WizardTest.h"
@@ -36,15 +38,21 @@ protected:
         }
         return true;
     }
-    static bool MovesOver(const std::string& name) {
+    bool MovesOver(const std::string& name) {
         const fs::path foreign = Foreign(name).WriteTo(R"(C:\Elsewhere)");
-        boost::system::error_code error;
-        fs::rename(foreign, fs::path(InPackages(foreign.filename().string())), error);
+        return Renames(foreign.string(), InPackages(foreign.filename().string()));
+    }
+
+    /// Both by the host's own means, as another program has them: on the hosted machine itself a file that this process
+    /// has open stays where it is.
+    bool Renames(const std::string& from, const std::string& to) {
+        std::error_code error;
+        std::filesystem::rename(machine.HostName(from), machine.HostName(to), error);
         return !error;
     }
-    static bool Removes(const std::string& fileName) {
-        boost::system::error_code error;
-        return fs::remove(fs::path(InPackages(fileName)), error) && !error;
+    bool Removes(const std::string& fileName) {
+        std::error_code error;
+        return std::filesystem::remove(machine.HostName(InPackages(fileName)), error) && !error;
     }
 
     /// Presses Install and expects the refusal that the test of the packages gives, for this reason.
@@ -109,10 +117,9 @@ TEST_F(WizardSurroundings, APackageThatIsReplacedByAnotherOfItsSizeIsNotInstalle
     BeginAndAgree();
     std::string bytes = machine.Content(InPackages(kGlow));
     machine.Has(R"(C:\Elsewhere\swapped)", bytes);
-    boost::system::error_code error;
-    fs::rename(fs::path(R"(C:\Elsewhere\swapped)"), fs::path(InPackages(kGlow)), error);
+    const bool done = Renames(R"(C:\Elsewhere\swapped)", InPackages(kGlow));
     toolkit.Press(HV::kContinueCommand);
-    ExpectHeldOrRefused(!error, "validation of " + kGlow + " failed.");
+    ExpectHeldOrRefused(done, "validation of " + kGlow + " failed.");
 }
 
 TEST_F(WizardSurroundings, APackageThatGoesAtTheWelcomePageEndsTheWizard) {
@@ -127,10 +134,9 @@ TEST_F(WizardSurroundings, ASuiteThatIsReplacedAtTheWelcomePageRegistersNothing)
     Ships(Product("glow"));
     BeginAndAgree();
     machine.Has(R"(C:\Elsewhere\suite.json)", R"({"identifier": "x", "version": "1", "display_name": "Foreign"})");
-    boost::system::error_code error;
-    fs::rename(fs::path(R"(C:\Elsewhere\suite.json)"), fs::path(InPackages("suite.json")), error);
+    const bool done = Renames(R"(C:\Elsewhere\suite.json)", InPackages("suite.json"));
     toolkit.Press(HV::kContinueCommand);
-    ExpectHeldOrRefused(!error, "validation of suite.json failed.");
+    ExpectHeldOrRefused(done, "validation of suite.json failed.");
 }
 
 class AddedFile : public WizardSurroundings, public testing::WithParamInterface<const char*> {};
@@ -190,15 +196,14 @@ TEST_F(WizardSurroundings, FilesThatTheEngineDoesNotReadMayComeAndGo) {
 TEST_F(WizardSurroundings, APackagesFolderThatIsSwappedAtTheWelcomePageIsNotInstalledFrom) {
     Ships(Product("glow"));
     BeginAndAgree();
-    boost::system::error_code error;
-    fs::rename(fs::path(kPackages), fs::path(R"(C:\Setup\before)"), error);
-    if (!error) {
+    const bool done = Renames(kPackages, R"(C:\Setup\before)");
+    if (done) {
         machine.Has(InPackages("suite.json"), machine.Content(R"(C:\Setup\before\suite.json)"));
         (void)Foreign("glow").WriteTo(kPackages);
     }
     toolkit.Press(HV::kContinueCommand);
     // Wine renames a folder whose files are open; Windows does not. Either way nothing foreign is installed.
-    if (!error) {
+    if (done) {
         ExpectRefusal("validation of suite.json failed.");
     } else {
         ExpectInstall();

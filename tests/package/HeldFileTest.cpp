@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
+#include <system_error>
+
 #include "platform/filesystem.h"
 #include "tests/support/Machine.h"
 
@@ -17,9 +20,11 @@ class HeldFileTest : public testing::Test {
 protected:
     HeldFileTest() { machine.Has(kFile, "abc"); }
 
-    static bool MovesOver(const char* path) {
-        boost::system::error_code error;
-        fs::rename(fs::path(R"(C:\Release\other)"), fs::path(path), error);
+    /// By the host's own means, as another program has them: on the hosted machine itself a file that this process has
+    /// open stays where it is.
+    bool MovesOver(const char* path) {
+        std::error_code error;
+        std::filesystem::rename(machine.HostName(R"(C:\Release\other)"), machine.HostName(path), error);
         return !error;
     }
 
@@ -69,8 +74,8 @@ TEST_F(HeldFileTest, IsReplacedByNobodyOrNotUnnoticed) {
 
 TEST_F(HeldFileTest, IsDeletedByNobodyOrNotUnnoticed) {
     const HV::HeldFile file{fs::path(kFile)};
-    boost::system::error_code error;
-    const bool done = fs::remove(fs::path(kFile), error) && !error;
+    std::error_code error;
+    const bool done = std::filesystem::remove(machine.HostName(kFile), error) && !error;
     EXPECT_EQ(done, !kSystemHoldsFiles);
     EXPECT_EQ(file.IsUntouched(), !done);
 }
