@@ -5,10 +5,14 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <memory>
+#include <string>
 #include <string_view>
+#include <vector>
 
 #include "platform/hosted/host_file.h"
+#include "platform/hosted/ignoring_case.h"
 #include "platform/hosted/machine.h"
 
 namespace platform {
@@ -47,8 +51,18 @@ Stream OpenFolder(int parent, const char* name) {
     return stream;
 }
 
-bool IsOwnName(std::string_view name) {
-    return name == "." || name == "..";
+/// What lies in the folder, in the order in which Windows lists it: a deletion that stops half-way leaves the same
+/// there.
+std::vector<std::string> NamesIn(DIR* folder) {
+    std::vector<std::string> names;
+    while (const dirent* entry = readdir(folder)) {
+        const std::string_view name(entry->d_name);
+        if (name != "." && name != "..") {
+            names.emplace_back(name);
+        }
+    }
+    std::sort(names.begin(), names.end(), hosted::LessIgnoringCase());
+    return names;
 }
 
 /// Removes `name` from the open folder `parent`. `hostPath` is what it is called, for the machine's faults.
@@ -59,13 +73,10 @@ bool EmptyFolder(int parent, const char* name, const std::string& hostPath) {
     if (folder == nullptr) {
         return false;
     }
-    while (const dirent* entry = readdir(folder.get())) {
-        if (!IsOwnName(entry->d_name) &&
-            !RemoveIn(dirfd(folder.get()), entry->d_name, hostPath + "/" + entry->d_name)) {
-            return false;
-        }
-    }
-    return true;
+    const std::vector<std::string> names = NamesIn(folder.get());
+    return std::all_of(names.begin(), names.end(), [&](const std::string& item) {
+        return RemoveIn(dirfd(folder.get()), item.c_str(), hostPath + "/" + item);
+    });
 }
 
 bool RemoveIn(int parent, const char* name, const std::string& hostPath) {
