@@ -19,7 +19,7 @@ public:
 
 private:
     HBITMAP picture_ = nullptr;
-    WinWizardController& controller_;
+    [[maybe_unused]] WinWizardController& controller_;  // a page without buttons has nothing to ask it
 };
 
 }  // namespace HV
