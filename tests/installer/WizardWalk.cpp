@@ -12,6 +12,10 @@ WizardWalk::WizardWalk() {
 
 WizardWalk::~WizardWalk() {
     EndTheRun();
+    if (wizard.job != nullptr) {
+        // The engine holds its stash as long as it lives, which is otherwise the process's life.
+        wizard.job->cli.reset();
+    }
     // An install makes a folder of its machine the current one.
     fs::current_path(folder_);
     HV::InstallerModel::Forget();
