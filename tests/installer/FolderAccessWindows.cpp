@@ -26,14 +26,15 @@ std::wstring HostName(const std::string& folder) {
     return wide;
 }
 
-/// The first line of the file, once it is whole. Nobody can wait for a program of the host itself.
+/// The first line of the file, once it is there. Nobody can wait for a program of the host itself, and reading while it
+/// writes would move the place where it writes: both have one.
 std::string LineIn(int file) {
     using namespace std::chrono_literals;
     const auto deadline = std::chrono::steady_clock::now() + 30s;
     while (std::chrono::steady_clock::now() < deadline) {
-        const std::string text = ReadScratchFile(file);
-        if (const std::size_t end = text.find('\n'); end != std::string::npos) {
-            return text.substr(0, end);
+        if (_filelengthi64(file) > 0) {
+            const std::string text = ReadScratchFile(file);
+            return text.substr(0, text.find('\n'));
         }
         std::this_thread::sleep_for(5ms);
     }
