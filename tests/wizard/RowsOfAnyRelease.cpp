@@ -3,31 +3,39 @@
 #include <deque>
 #include <vector>
 
-#include "hvframework/FileUtils.h"
 #include "installer/StartUp.h"
+#include "package/HeldFile.h"
 #include "package/ValidationTable.h"
 #include "platform/filesystem.h"
 
 namespace {
 
-using namespace HVL;
-
 struct Release {
     Release() {
         for (const fs::directory_entry& entry : fs::directory_iterator(fs::path(HV::PackagesDirectoryPath()))) {
             const std::string& name = texts.emplace_back(entry.path().filename().string());
-            const std::string& md5 = texts.emplace_back(FileUtils::GetFileMD5(entry.path().string()));
-            rows.push_back({name, "None", "", "", md5});
+            const HV::FileDigests found = HV::HeldFile(entry.path()).Digests();
+            rows.push_back({name, "None", "", "", texts.emplace_back(found.md5)});
+            digests.push_back({name, texts.emplace_back(found.sha256)});
         }
     }
 
     std::deque<std::string> texts;
     std::vector<HV::ValidationRow> rows;
+    std::vector<HV::ReleaseDigest> digests;
 };
+
+const Release& TheRelease() {
+    static const Release release;
+    return release;
+}
 
 }  // namespace
 
 std::span<const HV::ValidationRow> HV::ValidationRows() {
-    static const Release release;
-    return release.rows;
+    return TheRelease().rows;
+}
+
+std::span<const HV::ReleaseDigest> HV::ReleaseDigests() {
+    return TheRelease().digests;
 }
