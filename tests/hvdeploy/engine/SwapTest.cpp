@@ -4,6 +4,7 @@
 #include <atomic>
 #include <filesystem>
 #include <fstream>
+#include <optional>
 #include <thread>
 
 #include "tests/hvdeploy/engine/EngineTest.h"
@@ -90,7 +91,7 @@ protected:
 }  // namespace
 
 TEST_F(SwapTest, NeitherAScriptNorAPayloadCanBeSwapped) {
-    int honest = 0;
+    std::atomic<int> seen = 0;
     for (int round = 0; round < kRounds; ++round) {
         SCOPED_TRACE(round);
         Machine machine;
@@ -103,12 +104,14 @@ TEST_F(SwapTest, NeitherAScriptNorAPayloadCanBeSwapped) {
                                      .WriteTo(kPackages);
         const std::string planted = Says(machine, "planted");
         const host::path temp(machine.HostName(machine.TempFolder()));
-        const Attacker attacker([&] {
+        const auto attack = [&] {
             Swap(
                 temp, "tmp",
-                [](const host::path& folder) {
+                [&](const host::path& folder) {
                     std::error_code ignored;
-                    return host::exists(folder / "scripts/mark.bat", ignored);
+                    const bool ripe = host::exists(folder / "scripts/mark.bat", ignored);
+                    seen += ripe ? 1 : 0;
+                    return ripe;
                 },
                 [&](const host::path& folder) {
                     std::error_code ignored;
@@ -116,20 +119,25 @@ TEST_F(SwapTest, NeitherAScriptNorAPayloadCanBeSwapped) {
                     Write(folder / "scripts/mark.bat", planted);
                     Write(folder / "glow.dll", "planted");
                 });
-        });
+        };
+        // The first round shows that the package installs where nobody disturbs it: an attacker may stop a run.
+        std::optional<Attacker> attacker;
+        if (round > 0) {
+            attacker.emplace(attack);
+        }
         HV::EngineResult result = 0;
         {
             HV::Deploy engine(nullptr);
             result = engine.DeployPackage(package);
         }
+        EXPECT_TRUE(round > 0 || result == 1) << result;
         if (result == 1) {
-            ++honest;
             EXPECT_EQ(machine.Content(R"(C:\mark)").substr(0, 6), "honest");
             EXPECT_EQ(machine.Content(kOwnFile), "honest");
         }
         EXPECT_TRUE(result == 1 || !machine.HasFile(kOwnFile)) << result;
     }
-    EXPECT_GT(honest, kRounds / 2);
+    EXPECT_GT(seen, 0);
 }
 
 TEST_F(SwapTest, NoStashedFileCanBeSwapped) {
