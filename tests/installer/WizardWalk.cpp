@@ -1,7 +1,7 @@
 #include "tests/installer/WizardWalk.h"
 
-#include <boost/date_time/posix_time/posix_time_types.hpp>
 #include <chrono>
+#include <future>
 #include <thread>
 
 #include "hvframework/FileUtils.h"
@@ -55,7 +55,8 @@ void WizardWalk::WaitForJob() {
     if (wizard.job == nullptr || wizard.job->thread == nullptr || !wizard.job->thread->joinable()) {
         return;
     }
-    EXPECT_TRUE(wizard.job->thread->timed_join(boost::posix_time::minutes(1))) << log.Text();
+    const std::future<void> end = std::async(std::launch::async, [this] { wizard.job->thread->join(); });
+    EXPECT_EQ(end.wait_for(std::chrono::minutes(1)), std::future_status::ready) << log.Text();
 }
 
 void WizardWalk::TickToTheEnd() {
