@@ -36,6 +36,10 @@ void WriteOut(const std::string& folder) {
     ::_exit(kCannotStart);
 }
 
+double Seconds(const timeval& time) {
+    return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
+}
+
 int WaitFor(pid_t process, rusage& usage) {
     int status = 0;
     while (::wait4(process, &status, 0, &usage) < 0) {
@@ -62,6 +66,7 @@ Run RunProgram(const std::vector<std::string>& command, const std::string& machi
     Run run;
     run.status = WaitFor(process, usage);
     run.seconds = std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+    run.processorSeconds = Seconds(usage.ru_utime) + Seconds(usage.ru_stime);
     run.peakKilobytes = usage.ru_maxrss;
     if (run.status != expectedStatus) {
         throw std::runtime_error(command[0] + " ended with status " + std::to_string(run.status));

@@ -8,7 +8,8 @@ namespace HVBench {
 /// What one run of a program took.
 struct Run {
     double seconds = 0;
-    long peakKilobytes = 0;  // the most memory that it held at once
+    double processorSeconds = 0;  // its own and those of the programs that it waited for, in the system's calls as well
+    long peakKilobytes = 0;       // the most memory that it held at once
     int status = 0;
 };
 

@@ -23,7 +23,7 @@ struct SuiteShape {
 void MakeSuite(const SuiteShape& shape, const std::string& hvpack, const std::filesystem::path& work,
                const std::filesystem::path& packages);
 
-/// The file of the package that fails. Its name puts it into the last phase, behind all others: within a phase packages
+/// The file of the package that fails. Its name puts it into the last phase, after all others: within a phase packages
 /// come in the order in which the folder lists them, which may be any.
 inline constexpr const char* kFailingPackage = "postflight-fails.hvpkg";
 
