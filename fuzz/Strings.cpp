@@ -1,4 +1,4 @@
-// The table of the wizard's texts. Before the last zero byte stands the table, behind it a replacement for a token.
+// The table of the wizard's texts. Before the last zero byte stands the table, after it a replacement for a token.
 #include "fuzz/Fuzzing.h"
 #include "system/XMLStringsResource.h"
 

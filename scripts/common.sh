@@ -26,7 +26,7 @@ versions() {
 
 # publish FUNCTION FOLDER: makes FOLDER by calling FUNCTION with an empty folder beside it, which is then renamed, so
 # that FOLDER is either missing or whole. Whoever comes at the same time waits. FOLDER lies in the cache. Call it as a
-# command of its own, never behind `if` or before `||`: there the shell would walk past steps that fail.
+# command of its own, never after `if` or before `||`: there the shell would walk past steps that fail.
 publish() {
     local make=$1 folder=$2 aside lock
     [[ -d $folder ]] && return

@@ -9,7 +9,7 @@ using EngineTableTest = EngineTest;
 
 const std::string kGlow = "com.halvorn.tessaly.glow.zip";
 
-/// A package that bears the name of one of the release's, and is another.
+/// A package that has the name of one of the release's, and is another.
 PackageBuilder ImpostorOfGlow() {
     return PackageBuilder("com.halvorn.tessaly.glow")
         .Named(kGlow)

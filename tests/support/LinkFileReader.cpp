@@ -182,7 +182,7 @@ private:
         }
         (void)Take(4);
         if (at_ != file_.Size()) {
-            Refuse("there are bytes behind its end");
+            Refuse("there are bytes after its end");
         }
     }
 

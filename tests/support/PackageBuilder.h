@@ -57,7 +57,7 @@ public:
     // The archive
     PackageBuilder& File(const std::string& path, const std::string& bytes);
     PackageBuilder& Folder(const std::string& path);
-    /// An entry as it stands, lies included, behind all others. No folder is added for it.
+    /// An entry as it stands, lies included, after all others. No folder is added for it.
     PackageBuilder& RawEntry(const std::string& name, const std::string& bytes);
     PackageBuilder& RawEntry(ArchiveEntry entry);
     /// The manifest's text, in place of the one made from the calls above; also for a text that is no XML.

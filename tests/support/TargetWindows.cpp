@@ -274,7 +274,7 @@ MachineTarget::MachineTarget() : environment_(Environment()) {
 
 MachineTarget::~MachineTarget() {
     const Items added = AddedItems();
-    // What is in a folder stands behind the folder, so backwards it goes before it.
+    // The items of a folder come after the folder, so backwards they go before it.
     for (auto item = added.rbegin(); item != added.rend(); ++item) {
         RemoveItem(PathOf(item->first));
     }

@@ -217,7 +217,7 @@ protected:
     DoubtfulPackageTest() {
         description.Payload("plugin").Id("effect").File("Glow.aex", "bytes").Subpath("Halvorn/Glow");
     }
-    /// What `check` says, behind the words that each warning begins with.
+    /// What `check` says, after the words that each warning begins with.
     std::string Doubt() {
         (void)description.Named("glow.hvpkg").WriteTo(R"(C:\out)");
         EXPECT_EQ(Run({"check", R"(C:\out\glow.hvpkg)"}), 0) << err;
