@@ -2,6 +2,9 @@
 
 #include <algorithm>
 #include <iostream>
+#include <utility>
+
+#include "installer/StartUp.h"
 
 namespace HV {
 namespace {
@@ -17,7 +20,7 @@ bool LacksHost(const PackageInfo& package) {
 
 InstallerModel& InstallerModel::Instance() {
     if (theModel == nullptr) {
-        theModel = new InstallerModel();
+        theModel = new InstallerModel({.packagesDirectory = PackagesDirectoryPath()});
     }
     if (!theModel->loaded) {
         theModel->Load();
@@ -29,6 +32,8 @@ void InstallerModel::Forget() {
     delete theModel;
     theModel = nullptr;
 }
+
+InstallerModel::InstallerModel(Release release) : release_(std::move(release)) {}
 
 void InstallerModel::Load() {
     // First of all, so that nothing is loaded twice, whatever becomes of the rest.

@@ -1,16 +1,27 @@
 #pragma once
 
+#include <functional>
 #include <set>
+#include <span>
 #include <string>
 #include <vector>
 
 #include "hosts/HostAppCheck.h"
 #include "hvframework/ProductData.h"
 #include "package/HeldFile.h"
+#include "package/ValidationTable.h"
 #include "system/Processes.h"
 #include "system/XMLStringsResource.h"
 
 namespace HV {
+
+/// What a wizard may install: the packages of a folder, as far as they stand in tables. The tables are those of this
+/// build unless others are given; they are asked for when the folder has been listed.
+struct Release {
+    std::string packagesDirectory;
+    std::function<std::span<const ValidationRow>()> rows = ValidationRows;
+    std::function<std::span<const ReleaseDigest>()> digests = ReleaseDigests;
+};
 
 /// One package that has passed every check.
 struct PackageInfo {
@@ -26,11 +37,18 @@ struct PackageInfo {
 
 /// The data that the wizard works on: hosts, packages, the suite, the texts. It touches no window.
 ///
-/// There is one in a process. The main thread alone uses it; the engine reads everything again for itself.
+/// A program has one, Instance(), which its entry hands to whatever works on it. The main thread alone uses it; the
+/// engine reads everything again for itself.
 class InstallerModel {
 public:
-    /// The one model, made and loaded by the first call: hosts are detected, every package is digested and checked.
+    /// The one model of this program and of the release beside it, made and loaded by the first call.
     static InstallerModel& Instance();
+
+    /// A model that is not loaded yet. It takes a first snapshot of the processes.
+    explicit InstallerModel(Release release);
+
+    /// Detects hosts, digests and checks every package, and reads the suite and the texts. To be called once.
+    void Load();
 
     /// Drops the model, so that the next Instance() makes and loads another. A process that shows one wizard has no use
     /// for it; one that walks through many, as tests do, has.
@@ -77,15 +95,13 @@ public:
     Processes processes;
 
 private:
-    InstallerModel() = default;
-
-    void Load();
     [[nodiscard]] bool ScanPackages();
     [[nodiscard]] bool ValidatePackages();
     void HoldSuites();
     [[nodiscard]] bool IsReleased(const std::string& path, const std::set<std::string>& releasedNames);
     void LoadStringsResource();
 
+    Release release_;
     // Every file of the release, held from before it is tested until the process ends.
     std::vector<HeldFile> held_;
 };

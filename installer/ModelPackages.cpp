@@ -10,9 +10,7 @@
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "installer/InstallerModel.h"
-#include "installer/StartUp.h"
 #include "package/Package.h"
-#include "package/ValidationTable.h"
 #include "platform/filesystem.h"
 
 namespace HV {
@@ -177,7 +175,7 @@ void SortForDisplay(std::vector<PackageInfo>& packages) {
 }  // namespace
 
 bool InstallerModel::ScanPackages() {
-    packagesDirectory = PackagesDirectoryPath();
+    packagesDirectory = release_.packagesDirectory;
     FolderFiles files;
     const auto add = [&](const fs::path& path) { AddFile(path, files); };
     if (!HVL::FileUtils::DirectoryExists(packagesDirectory) || !ListFolder(packagesDirectory, add)) {
@@ -207,8 +205,8 @@ bool InstallerModel::IsReleased(const std::string& path, const std::set<std::str
         return false;
     }
     ValidationInfo row;
-    GetValidationInfo(name, row);
-    const FileDigests released{row.md5, SecondDigestOf(name)};
+    GetValidationInfo(name, row, release_.rows());
+    const FileDigests released{row.md5, SecondDigestOf(name, release_.digests())};
     if (held_.emplace_back(fs::path(path)).Digests() != released) {
         LogSpoiled(name);
         return false;
@@ -219,7 +217,7 @@ bool InstallerModel::IsReleased(const std::string& path, const std::set<std::str
 // The first bad file ends it, and then there is no list of packages at all: the wizard offers all of a release or none.
 bool InstallerModel::ValidatePackages() {
     std::vector<std::string> names;
-    GetValidationFileNames(names);
+    GetValidationFileNames(names, release_.rows());
     if (names.empty()) {
         std::cerr << "Fatal error - this installer build does not include validation information." << std::endl;
         return false;

@@ -39,8 +39,8 @@ std::string ChoosePropertyFile() {
 
 }  // namespace
 
-std::string PackagesDirectoryPath() {
-    return FileUtils::JoinPath(FileUtils::GetParentPath(ProgramPath()), "packages");
+std::string PackagesDirectoryPath(const std::string& programPath) {
+    return FileUtils::JoinPath(FileUtils::GetParentPath(programPath), "packages");
 }
 
 void StartLogging() {
@@ -55,8 +55,8 @@ void StartLogging() {
     Log::Detail().setPriority(log4cpp::Priority::DEBUG);
 }
 
-void RequirePackagesDirectory(WizardToolkit& toolkit) {
-    if (FileUtils::DirectoryExists(PackagesDirectoryPath())) {
+void RequirePackagesDirectory(WizardToolkit& toolkit, const std::string& packagesDirectory) {
+    if (FileUtils::DirectoryExists(packagesDirectory)) {
         return;
     }
     toolkit.MessageBeep(kStopBox);

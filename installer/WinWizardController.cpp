@@ -8,36 +8,35 @@
 
 namespace HV {
 
-WinWizardController::WinWizardController(WizardToolkit& toolkit) : toolkit_(toolkit) {}
+WinWizardController::WinWizardController(WizardToolkit& toolkit, InstallerModel& model)
+    : toolkit_(toolkit), model_(model) {}
 WinWizardController::~WinWizardController() = default;
 
 void WinWizardController::Initialize(int showCommand) {
-    const InstallerModel& model = InstallerModel::Instance();
-    MakeWindow(model.GetString("installer.title.noversion"), showCommand);
+    MakeWindow(model_.GetString("installer.title.noversion"), showCommand);
     CheckPackagesAndHosts();
-    hasProductChoice = !model.ShownIdentifiers().empty();
+    hasProductChoice = !model_.ShownIdentifiers().empty();
     toolkit_.SetContinueText(*window, FirstContinueText());
     initialized = true;
 }
 
 void WinWizardController::MakeWindow(const std::string& caption, int showCommand) {
-    window = toolkit_.CreateInstallerWindow(*this, caption);
-    welcomePage = toolkit_.CreateWelcomePage(*this, *window);
+    window = toolkit_.CreateInstallerWindow(*this, model_, caption);
+    welcomePage = toolkit_.CreateWelcomePage(*this, model_, *window);
     toolkit_.ShowWindow(WizardPart::MainWindow, showCommand);
 }
 
 // These boxes have no owner, so the window behind them takes presses. None of these is a command yet: packages that
 // have been refused must not be installed from behind the box that refuses them.
 void WinWizardController::CheckPackagesAndHosts() {
-    const InstallerModel& model = InstallerModel::Instance();
-    if (!model.valid) {
+    if (!model_.valid) {
         EndWithInvalidPackages();
     }
-    if (model.AllProductsLackHosts()) {
+    if (model_.AllProductsLackHosts()) {
         EndWith(nullptr, "Error: no hosts found.",
                 "This installer's products require host applications which are not installed on this computer.");
     }
-    if (model.SomeProductLacksHost()) {
+    if (model_.SomeProductLacksHost()) {
         toolkit_.MessageBeep(kWarningBox);
         toolkit_.MessageBoxA(nullptr,
                              "Some products require host applications which are not installed on this computer. "

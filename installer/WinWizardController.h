@@ -9,6 +9,7 @@
 namespace HV {
 
 class DeployJob;
+class InstallerModel;
 struct ProductItem;
 
 enum class WizardState : std::int32_t { Welcome = 0, Selection = 1, Installing = 2, Finished = 3, Failed = 4 };
@@ -17,19 +18,19 @@ enum class WizardState : std::int32_t { Welcome = 0, Selection = 1, Installing =
 /// and how its progress and its end come back.
 ///
 /// One object lives for the whole run, on the main thread, which alone calls it. It touches windows through the toolkit
-/// and nothing else, and works on InstallerModel::Instance(). Pages and job, once made, are kept until the process
-/// ends: Back hides a page, so the user's choice survives a trip.
+/// and nothing else. Pages and job, once made, are kept until the process ends: Back hides a page, so the user's choice
+/// survives a trip.
 class WinWizardController {
 public:
-    /// `toolkit` is not owned and must outlive this object.
-    explicit WinWizardController(WizardToolkit& toolkit);
+    /// Neither is owned, and both must outlive this object. The model is loaded before Initialize().
+    WinWizardController(WizardToolkit& toolkit, InstallerModel& model);
     virtual ~WinWizardController();
 
     WinWizardController(const WinWizardController&) = delete;
     WinWizardController& operator=(const WinWizardController&) = delete;
 
-    /// Loads the model, shows the window (`showCommand` as the program was started with) and the first page, and
-    /// reports bad packages and missing hosts. Ends the process where the run cannot go on.
+    /// Shows the window (`showCommand` as the program was started with) and the first page, and reports bad packages
+    /// and missing hosts. Ends the process where the run cannot go on.
     void Initialize(int showCommand);
 
     /// Whether a command may run now: none before Initialize() has returned. Tells the user when no product is chosen.
@@ -95,6 +96,7 @@ private:
     [[nodiscard]] const char* FirstContinueText() const;
 
     WizardToolkit& toolkit_;
+    InstallerModel& model_;
 };
 
 }  // namespace HV

@@ -7,7 +7,7 @@
 namespace HV {
 
 void WinWizardController::RequireManagerClosed() {
-    while (InstallerModel::Instance().ManagerIsRunning() &&
+    while (model_.ManagerIsRunning() &&
            AskToRetry("Halvorn Application Manager is running.",
                       "Please quit Halvorn Application Manager and retry, or cancel to exit the installer.")) {
     }
@@ -17,8 +17,7 @@ void WinWizardController::RequireManagerClosed() {
 // HitFilm finds, makes the text's builder throw, and nobody catches that: there is no name to ask the user about.
 void WinWizardController::RequireHostsClosed() {
     std::vector<ProcessRecord> running;
-    while (InstallerModel::Instance().FindRunningHosts(running) &&
-           AskToRetry("Host applications running.", RunningHostsText(running))) {
+    while (model_.FindRunningHosts(running) && AskToRetry("Host applications running.", RunningHostsText(running))) {
     }
 }
 

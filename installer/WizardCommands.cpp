@@ -147,10 +147,9 @@ void WinWizardController::CreateSelectionPage() {
         // Fixed (contracts, wizard): the sentence lacks a word.
         throw std::runtime_error("This program not be allocating the selection page twice.");
     }
-    const InstallerModel& model = InstallerModel::Instance();
     std::vector<ProductItem> items;
-    for (const std::string& identifier : model.ShownIdentifiers()) {
-        const PackageInfo package = model.FindPackage(identifier);
+    for (const std::string& identifier : model_.ShownIdentifiers()) {
+        const PackageInfo package = model_.FindPackage(identifier);
         const bool usable = !package.requiresHost || package.hostFound;
         items.push_back({package.displayName, package.identifier, usable, usable});
     }

@@ -53,12 +53,12 @@ Report LatestReport(DeployJob& job) {
 }  // namespace
 
 void WinWizardController::CreateInstallingPage() {
-    installingPage = toolkit_.CreateInstallingPage(*this, *window, "Detecting host applications...", 0);
+    installingPage = toolkit_.CreateInstallingPage(*this, model_, *window, "Detecting host applications...", 0);
 }
 
 // Minutes may have gone by since the packages were tested.
 void WinWizardController::RefuseWhatHasChanged() {
-    if (!InstallerModel::Instance().PackagesAreUntouched()) {
+    if (!model_.PackagesAreUntouched()) {
         EndWithInvalidPackages();
     }
 }
@@ -68,12 +68,11 @@ void WinWizardController::StartInstall() {
     // Where the wizard was started is where the release lies, often a folder of downloads: no script is to find its
     // programs there. All paths of the line are whole ones.
     platform::EnterSystemFolder();
-    const InstallerModel& model = InstallerModel::Instance();
     RefuseWhatHasChanged();
     job =
-        KeptJob(InstallLine({toolkit_.UncheckedIdentifiers(*selectionPage), LogPathPrefix(model.suite.GetIdentifier()),
-                             std::time(nullptr), model.packagesDirectory}));
-    job->AcceptOnly(model.NamesOfRelease());
+        KeptJob(InstallLine({toolkit_.UncheckedIdentifiers(*selectionPage), LogPathPrefix(model_.suite.GetIdentifier()),
+                             std::time(nullptr), model_.packagesDirectory}));
+    job->AcceptOnly(model_.NamesOfRelease());
     job->Start();
     toolkit_.SetTimer(*window, kProgressTimer, kMillisecondsBetweenPolls);
 }

@@ -4,20 +4,13 @@
 #include "installer/WinWizardController.h"
 
 namespace HV {
-namespace {
-
-std::string ProductUrl() {
-    return InstallerModel::Instance().suite.GetValue("product_url");
-}
-
-}  // namespace
 
 void WinWizardController::OpenWhatsNew() {
-    OpenUrl(WhatsNewUrl(ProductUrl()));
+    OpenUrl(WhatsNewUrl(model_.suite.GetValue("product_url")));
 }
 
 void WinWizardController::OpenResources() {
-    OpenUrl(ResourcesUrl(ProductUrl()));
+    OpenUrl(ResourcesUrl(model_.suite.GetValue("product_url")));
 }
 
 void WinWizardController::OpenUrl(const std::string& url) {

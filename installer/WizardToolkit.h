@@ -14,6 +14,7 @@ namespace HV {
 
 class EULAWindowController;
 class FinalPage;
+class InstallerModel;
 class InstallerWindow;
 class InstallingPage;
 class SelectionPage;
@@ -59,14 +60,16 @@ public:
 
     /// Makes the main window, hidden and centred on its monitor, with the caption of its frame. Its buttons go to
     /// Perform() of the controller, the timer kProgressTimer to OnProgressTimer(). There is one in a process.
-    virtual InstallerWindow* CreateInstallerWindow(WinWizardController& controller, const std::string& caption) = 0;
+    virtual InstallerWindow* CreateInstallerWindow(WinWizardController& controller, const InstallerModel& model,
+                                                   const std::string& caption) = 0;
 
     /// The pages, children of the main window, each visible from the start.
-    virtual WelcomePage* CreateWelcomePage(WinWizardController& controller, InstallerWindow& window) = 0;
+    virtual WelcomePage* CreateWelcomePage(WinWizardController& controller, const InstallerModel& model,
+                                           InstallerWindow& window) = 0;
     virtual SelectionPage* CreateSelectionPage(WinWizardController& controller, InstallerWindow& window,
                                                const std::vector<ProductItem>& items) = 0;
-    virtual InstallingPage* CreateInstallingPage(WinWizardController& controller, InstallerWindow& window,
-                                                 const std::string& status, int percent) = 0;
+    virtual InstallingPage* CreateInstallingPage(WinWizardController& controller, const InstallerModel& model,
+                                                 InstallerWindow& window, const std::string& status, int percent) = 0;
     virtual FinalPage* CreateFinalPage(WinWizardController& controller, InstallerWindow& window) = 0;
 
     /// What opens agreement viewers, and one more viewer.

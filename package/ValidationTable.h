@@ -18,12 +18,6 @@ struct ValidationInfo {
     std::string md5;  // of the whole package file: 32 hexadecimal digits, lower case
 };
 
-/// Fills `names` with the file names of the packages, in table order.
-void GetValidationFileNames(std::vector<std::string>& names);
-
-/// Fills `info` with the row of a file name, compared exactly; leaves it alone for a name that is not in the table.
-void GetValidationInfo(const std::string& name, ValidationInfo& info);
-
 /// A row as it stands in the source.
 struct ValidationRow {
     std::string_view fileName;
@@ -36,6 +30,13 @@ struct ValidationRow {
 /// The rows of this build, in table order.
 std::span<const ValidationRow> ValidationRows();
 
+/// Fills `names` with the file names of the packages, in table order.
+void GetValidationFileNames(std::vector<std::string>& names, std::span<const ValidationRow> rows = ValidationRows());
+
+/// Fills `info` with the row of a file name, compared exactly; leaves it alone for a name that is not in the table.
+void GetValidationInfo(const std::string& name, ValidationInfo& info,
+                       std::span<const ValidationRow> rows = ValidationRows());
+
 /// A package's second digest, as it stands in the source. MD5 tells a broken file from a good one; that nobody has made
 /// another file for the same digest is what this one is for. The list stands beside the rows and names the same files.
 struct ReleaseDigest {
@@ -47,6 +48,7 @@ struct ReleaseDigest {
 std::span<const ReleaseDigest> ReleaseDigests();
 
 /// The second digest of a file name, compared exactly; empty for a name that is not in the list.
-[[nodiscard]] std::string SecondDigestOf(const std::string& name);
+[[nodiscard]] std::string SecondDigestOf(const std::string& name,
+                                         std::span<const ReleaseDigest> digests = ReleaseDigests());
 
 }  // namespace HV

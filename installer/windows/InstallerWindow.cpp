@@ -18,10 +18,8 @@ constexpr unsigned kTitleFormat = DT_SINGLELINE | DT_BOTTOM;
 
 }  // namespace
 
-InstallerWindow::InstallerWindow(WinWizardController& controller)
-    : banner_(LoadOwnBitmap(kBanner)),
-      controller_(controller),
-      title_(InstallerModel::Instance().GetString("installer.title")) {
+InstallerWindow::InstallerWindow(WinWizardController& controller, const InstallerModel& model)
+    : banner_(LoadOwnBitmap(kBanner)), controller_(controller), title_(model.GetString("installer.title")) {
     const Gdiplus::SolidBrush strip(Gdiplus::Color(OpaqueOf(WizardMetrics::BarColor)));
     buttonOwner_ = std::make_unique<WindowCustomButtonOwner>(strip);
 }

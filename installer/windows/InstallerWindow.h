@@ -9,6 +9,7 @@
 
 namespace HV {
 
+class InstallerModel;
 class WinWizardController;
 
 /// The wizard's one main window: a dark frame of fixed size with a banner, a title line, a strip of buttons along the
@@ -18,8 +19,8 @@ class WinWizardController;
 /// and widens when the install has finished. Belongs to the main thread and lives until the process ends.
 class InstallerWindow : public ATL::CWindowImpl<InstallerWindow> {
 public:
-    /// `controller` is not owned. Takes the title line from the model's texts.
-    explicit InstallerWindow(WinWizardController& controller);
+    /// `controller` is not owned. The title line is one of the model's texts.
+    InstallerWindow(WinWizardController& controller, const InstallerModel& model);
 
     /// Makes the window, hidden and centred on its monitor, with the caption of its frame. Returns whether it is there.
     [[nodiscard]] bool CreateCentered(const std::string& caption);

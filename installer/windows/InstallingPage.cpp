@@ -10,8 +10,9 @@
 
 namespace HV {
 
-InstallingPage::InstallingPage(WinWizardController& controller, std::string status, std::int32_t percent)
-    : percent_(percent), status_(std::move(status)), controller_(controller) {}
+InstallingPage::InstallingPage(WinWizardController& controller, const InstallerModel& model, std::string status,
+                               std::int32_t percent)
+    : percent_(percent), status_(std::move(status)), controller_(controller), model_(model) {}
 
 ATL::CWndClassInfo& InstallingPage::GetWndClassInfo() {
     static ATL::CWndClassInfo info;
@@ -37,7 +38,7 @@ BOOL InstallingPage::ProcessWindowMessage(HWND window, UINT message, WPARAM wPar
 }
 
 void InstallingPage::OnCreate() {
-    title_ = InstallerModel::Instance().GetString("installer.wait.message");
+    title_ = model_.GetString("installer.wait.message");
     const RECT client = GetClientRect();
     titleRect_ = {client.left + 1, client.top + 46, client.right - 20, client.top + 68};
     barRect_ = {client.left, titleRect_.bottom + 8, client.right - 20,

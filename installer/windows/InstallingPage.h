@@ -7,13 +7,15 @@
 
 namespace HV {
 
+class InstallerModel;
 class WinWizardController;
 
 /// The page of a running install: a title, a bar and a line of status.
 class InstallingPage : public ATL::CWindowImpl<InstallingPage> {
 public:
-    /// `controller` is not owned.
-    InstallingPage(WinWizardController& controller, std::string status, std::int32_t percent);
+    /// Neither is owned. The model has the title.
+    InstallingPage(WinWizardController& controller, const InstallerModel& model, std::string status,
+                   std::int32_t percent);
 
     BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~InstallingPage() override = default;
@@ -38,7 +40,8 @@ private:
     std::int32_t percent_;
     std::string title_;
     std::string status_;
-    WinWizardController& controller_;
+    [[maybe_unused]] WinWizardController& controller_;  // a page without buttons has nothing to ask it
+    const InstallerModel& model_;
 };
 
 }  // namespace HV

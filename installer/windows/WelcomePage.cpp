@@ -14,8 +14,8 @@ constexpr int kWidth = 70;  // of Agree and Disagree
 
 }  // namespace
 
-WelcomePage::WelcomePage(WinWizardController& controller)
-    : brush_(Gdiplus::Color(OpaqueOf(WizardMetrics::PageColor))), controller_(controller) {}
+WelcomePage::WelcomePage(WinWizardController& controller, const InstallerModel& model)
+    : brush_(Gdiplus::Color(OpaqueOf(WizardMetrics::PageColor))), controller_(controller), model_(model) {}
 
 ATL::CWndClassInfo& WelcomePage::GetWndClassInfo() {
     static ATL::CWndClassInfo info;
@@ -54,10 +54,9 @@ void WelcomePage::OnCreate() {
 }
 
 void WelcomePage::LoadTexts() {
-    const InstallerModel& model = InstallerModel::Instance();
-    paragraph = model.GetString("installer.welcome.p-1");
+    paragraph = model_.GetString("installer.welcome.p-1");
     requirementsHeading = "System Requirements";
-    requirements = model.GetString("installer.welcome.sysreq");
+    requirements = model_.GetString("installer.welcome.sysreq");
     // A bare return breaks the line where these lines are drawn; the blank before it belongs to the text.
     agreementNotice = "To continue with the install you must agree \rto the terms of the software license agreement.";
     agreementChoice = "Click Agree to continue or Disagree to cancel \rand quit the installation.";

@@ -7,14 +7,15 @@
 
 namespace HV {
 
+class InstallerModel;
 class WinWizardController;
 
 /// The first page: what will be installed, and the decision about the licence agreement. Its buttons go to the
 /// controller.
 class WelcomePage : public ATL::CWindowImpl<WelcomePage>, public CustomButtonOwner {
 public:
-    /// `controller` is not owned.
-    explicit WelcomePage(WinWizardController& controller);
+    /// Neither is owned. The model has the texts.
+    WelcomePage(WinWizardController& controller, const InstallerModel& model);
 
     BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~WelcomePage() override = default;
@@ -44,6 +45,7 @@ private:
 
     Gdiplus::SolidBrush brush_;
     WinWizardController& controller_;
+    const InstallerModel& model_;
 };
 
 }  // namespace HV

@@ -45,15 +45,17 @@ HWND HandleOfWindow(const ATL::CWindow* window) {
 
 }  // namespace
 
-InstallerWindow* WindowsToolkit::CreateInstallerWindow(WinWizardController& controller, const std::string& caption) {
-    auto window = std::make_unique<InstallerWindow>(controller);
+InstallerWindow* WindowsToolkit::CreateInstallerWindow(WinWizardController& controller, const InstallerModel& model,
+                                                       const std::string& caption) {
+    auto window = std::make_unique<InstallerWindow>(controller, model);
     Require(window->CreateCentered(caption));
     window_ = window.release();
     return window_;
 }
 
-WelcomePage* WindowsToolkit::CreateWelcomePage(WinWizardController& controller, InstallerWindow& window) {
-    welcomePage_ = PutInto(window, std::make_unique<WelcomePage>(controller), WizardMetrics::PageRect);
+WelcomePage* WindowsToolkit::CreateWelcomePage(WinWizardController& controller, const InstallerModel& model,
+                                               InstallerWindow& window) {
+    welcomePage_ = PutInto(window, std::make_unique<WelcomePage>(controller, model), WizardMetrics::PageRect);
     return welcomePage_;
 }
 
@@ -67,10 +69,10 @@ SelectionPage* WindowsToolkit::CreateSelectionPage(WinWizardController& controll
     return selectionPage_;
 }
 
-InstallingPage* WindowsToolkit::CreateInstallingPage(WinWizardController& controller, InstallerWindow& window,
-                                                     const std::string& status, int percent) {
+InstallingPage* WindowsToolkit::CreateInstallingPage(WinWizardController& controller, const InstallerModel& model,
+                                                     InstallerWindow& window, const std::string& status, int percent) {
     installingPage_ =
-        PutInto(window, std::make_unique<InstallingPage>(controller, status, percent), WizardMetrics::PageRect);
+        PutInto(window, std::make_unique<InstallingPage>(controller, model, status, percent), WizardMetrics::PageRect);
     return installingPage_;
 }
 

@@ -15,12 +15,14 @@ namespace HV {
 /// system refuses a window.
 class WindowsToolkit : public WizardToolkit {
 public:
-    InstallerWindow* CreateInstallerWindow(WinWizardController& controller, const std::string& caption) override;
-    WelcomePage* CreateWelcomePage(WinWizardController& controller, InstallerWindow& window) override;
+    InstallerWindow* CreateInstallerWindow(WinWizardController& controller, const InstallerModel& model,
+                                           const std::string& caption) override;
+    WelcomePage* CreateWelcomePage(WinWizardController& controller, const InstallerModel& model,
+                                   InstallerWindow& window) override;
     SelectionPage* CreateSelectionPage(WinWizardController& controller, InstallerWindow& window,
                                        const std::vector<ProductItem>& items) override;
-    InstallingPage* CreateInstallingPage(WinWizardController& controller, InstallerWindow& window,
-                                         const std::string& status, int percent) override;
+    InstallingPage* CreateInstallingPage(WinWizardController& controller, const InstallerModel& model,
+                                         InstallerWindow& window, const std::string& status, int percent) override;
     FinalPage* CreateFinalPage(WinWizardController& controller, InstallerWindow& window) override;
 
     EULAWindowController* CreateEULAWindowController() override;

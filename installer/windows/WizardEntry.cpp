@@ -4,6 +4,7 @@
 #include <thread>
 
 #include "hvframework/Log.h"
+#include "installer/InstallerModel.h"
 #include "installer/StartUp.h"
 #include "installer/WinWizardController.h"
 #include "installer/windows/WindowSystem.h"
@@ -45,8 +46,8 @@ int ShowWizard(HINSTANCE instance, int showCommand) {
     module.Init(instance);
     RegisteredLoop loop(module);
     WindowsToolkit toolkit;
-    WinWizardController controller(toolkit);
-    RequirePackagesDirectory(toolkit);
+    RequirePackagesDirectory(toolkit, PackagesDirectoryPath());
+    WinWizardController controller(toolkit, InstallerModel::Instance());
     controller.Initialize(showCommand);
     return loop.Run();
 }

@@ -2,7 +2,6 @@
 #include <gtest/gtest.h>
 
 #include "installer/InstallerModel.h"
-#include "tests/support/CapturedStreams.h"
 #include "tests/support/Machine.h"
 #include "tests/support/RunningProgram.h"
 
@@ -12,24 +11,17 @@ using Names = std::vector<std::string>;
 
 class ModelProcessesTest : public testing::Test {
 protected:
-    ModelProcessesTest() {
-        HV::InstallerModel::Forget();
-        const CapturedStreams streams;
-        model = &HV::InstallerModel::Instance();
-    }
-    ~ModelProcessesTest() override { HV::InstallerModel::Forget(); }
-
     void Uses(const std::vector<std::string>& hostRefs) {
         HV::PackageInfo package;
         package.hostRefs = hostRefs;
-        model->packages.push_back(package);
+        model.packages.push_back(package);
     }
 
     /// The names of the running hosts on drive C. What runs outside of the machine may be a host too, of whoever works
     /// on this computer.
     Names Found() {
         std::vector<HV::ProcessRecord> found;
-        const bool any = model->FindRunningHosts(found);
+        const bool any = model.FindRunningHosts(found);
         EXPECT_EQ(any, !found.empty());
         Names names;
         for (const HV::ProcessRecord& record : found) {
@@ -41,7 +33,7 @@ protected:
     }
 
     Machine machine;
-    HV::InstallerModel* model = nullptr;
+    HV::InstallerModel model{{}};
 };
 
 TEST_F(ModelProcessesTest, SeesAfterEffectsUntilItEnds) {
@@ -90,17 +82,17 @@ TEST_F(ModelProcessesTest, DoesNotAskForVegas) {
 }
 
 TEST_F(ModelProcessesTest, SeesTheManagerUntilItEnds) {
-    EXPECT_FALSE(model->ManagerIsRunning());
+    EXPECT_FALSE(model.ManagerIsRunning());
     RunningProgram manager(machine, R"(C:\Program Files\Halvorn\Halvorn Application Manager.exe)");
-    EXPECT_TRUE(model->ManagerIsRunning());
+    EXPECT_TRUE(model.ManagerIsRunning());
     manager.End();
-    EXPECT_FALSE(model->ManagerIsRunning());
+    EXPECT_FALSE(model.ManagerIsRunning());
 }
 
 TEST_F(ModelProcessesTest, TakesNoOtherProgramForTheManager) {
     const RunningProgram updater(machine, R"(C:\Program Files\Halvorn\halvorn application manager.exe)");
     const RunningProgram helper(machine, R"(C:\Program Files\Halvorn Application Manager.exe\helper.exe)");
-    EXPECT_FALSE(model->ManagerIsRunning());
+    EXPECT_FALSE(model.ManagerIsRunning());
 }
 
 }  // namespace

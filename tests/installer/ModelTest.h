@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <map>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -20,12 +21,16 @@ class ModelTest : public testing::Test {
 protected:
     /// The model as the start of the wizard makes it.
     HV::InstallerModel& Load() {
-        HV::InstallerModel::Forget();
+        LetGo();
         CapturedStreams streams;
-        HV::InstallerModel& model = HV::InstallerModel::Instance();
+        model_ = std::make_unique<HV::InstallerModel>(SetupRelease());
+        model_->Load();
         errors = streams.Errors();
-        return model;
+        return *model_;
     }
+
+    /// The files that the model holds are free again.
+    void LetGo() { model_.reset(); }
 
     /// After Effects 22 and Media Composer; no other host.
     void HasTwoHosts() {
@@ -61,4 +66,7 @@ protected:
     LogRecorder log;
     SetupFolder setup{machine};
     std::string errors;  // what the last Load() wrote to standard error
+
+private:
+    std::unique_ptr<HV::InstallerModel> model_;
 };

@@ -7,12 +7,14 @@
 
 namespace {
 
+constexpr const char* kPackages = R"(C:\Setup\packages)";
+
 class PackagesDirectoryTest : public testing::Test {
 protected:
     /// The status with which the process would have ended.
     std::optional<unsigned> Require() {
         try {
-            HV::RequirePackagesDirectory(toolkit);
+            HV::RequirePackagesDirectory(toolkit, kPackages);
             return std::nullopt;
         } catch (const WizardEnded& end) {
             return end.status;
@@ -34,11 +36,11 @@ const ShownBox kBox{
 };
 
 TEST_F(PackagesDirectoryTest, LiesBesideTheProgram) {
-    EXPECT_EQ(HV::PackagesDirectoryPath(), R"(C:\Setup\packages)");
+    EXPECT_EQ(HV::PackagesDirectoryPath(R"(C:\Setup\hvinstaller.exe)"), kPackages);
 }
 
 TEST_F(PackagesDirectoryTest, IsEnoughForTheWizardToGoOn) {
-    machine.HasFolder(R"(C:\Setup\packages)");
+    machine.HasFolder(kPackages);
     EXPECT_EQ(Require(), std::nullopt);
     EXPECT_TRUE(toolkit.calls.empty());
 }
@@ -49,8 +51,8 @@ TEST_F(PackagesDirectoryTest, EndsTheWizardWithABoxWhenItIsMissing) {
     EXPECT_EQ(toolkit.boxes, std::vector<ShownBox>{kBox});
 }
 
-TEST_F(PackagesDirectoryTest, IsMissingWhereAFileBearsItsName) {
-    machine.Has(R"(C:\Setup\packages)", "no folder");
+TEST_F(PackagesDirectoryTest, IsMissingWhereAFileHasItsName) {
+    machine.Has(kPackages, "no folder");
     toolkit.AnswerNext(1);
     EXPECT_EQ(Require(), 0U);
     EXPECT_EQ(toolkit.boxes, std::vector<ShownBox>{kBox});

@@ -1,4 +1,4 @@
-// The wizard's own path; this program does not bring one of its own.
+// Where the wizard lies.
 #include <gtest/gtest.h>
 
 #include "hvframework/FileUtils.h"
@@ -10,7 +10,7 @@ namespace {
 TEST(ProgramPath, IsTheFullPathOfThisProgram) {
     const Machine machine;
     const std::string path = HV::ProgramPath();
-    EXPECT_EQ(HVL::FileUtils::GetFileName(path).rfind("program_path_tests", 0), 0U) << path;
+    EXPECT_EQ(HVL::FileUtils::GetFileName(path).rfind("start_up_tests", 0), 0U) << path;
     EXPECT_EQ(path.substr(1, 2), ":\\") << path;
     EXPECT_TRUE(HVL::FileUtils::FileExists(path)) << path;
 }

@@ -17,7 +17,6 @@ const std::string kGlow = R"(C:\Setup\packages\com.halvorn.tessaly.glow.zip)";
 class ReleaseModelTest : public testing::Test {
 protected:
     ReleaseModelTest() { EXPECT_EQ(HVL::FileUtils::CopyFileOrDirectory(HV_RELEASE_PACKAGES, kPackages), 0); }
-    ~ReleaseModelTest() override { HV::InstallerModel::Forget(); }
 
     void IsMachine(const std::string& name) {
         std::string registry;
@@ -28,11 +27,15 @@ protected:
 
     HV::InstallerModel& Load() {
         const CapturedStreams streams;  // the detector of EDIUS speaks on standard output
-        return HV::InstallerModel::Instance();
+        model_.Load();
+        return model_;
     }
 
     Machine machine;
     LogRecorder log;
+
+private:
+    HV::InstallerModel model_{{kPackages}};
 };
 
 TEST_F(ReleaseModelTest, EveryPackageIsGood) {

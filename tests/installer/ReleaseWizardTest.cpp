@@ -1,23 +1,16 @@
 // The sample release, installed by the wizard as a user does it, from a folder with a name that has everything.
 #include "hvframework/FileUtils.h"
-#include "installer/StartUp.h"
 #include "tests/installer/WizardWalk.h"
 
 namespace {
 
 constexpr const char* kFolder = R"(C:\Users\Public\Ann's, Bob's & (new) = Downloads)";
 
-}  // namespace
-
-std::string HV::ProgramPath() {
-    return std::string(kFolder) + R"(\hvinstaller.exe)";
-}
-
-namespace {
-
 class ReleaseWizard : public WizardWalk {
 protected:
-    ReleaseWizard() { EXPECT_EQ(HVL::FileUtils::CopyFileOrDirectory(HV_RELEASE_PACKAGES, PackagesFolder()), 0); }
+    ReleaseWizard() : WizardWalk({PackagesFolder()}) {
+        EXPECT_EQ(HVL::FileUtils::CopyFileOrDirectory(HV_RELEASE_PACKAGES, PackagesFolder()), 0);
+    }
 
     static std::string PackagesFolder() { return std::string(kFolder) + R"(\packages)"; }
     static constexpr const char* kGlow =

@@ -126,7 +126,7 @@ TEST_F(ScanTest, ATextThatIsNoJsonObjectIsRefused) {
     std::size_t refused = 0;
     for (const std::string& json : bad) {
         // The model before this one holds the file.
-        HV::InstallerModel::Forget();
+        LetGo();
         setup.HasSuite(json);
         const HV::InstallerModel& model = Load();
         EXPECT_FALSE(model.valid) << json.substr(0, 60);

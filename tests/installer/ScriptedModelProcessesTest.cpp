@@ -7,7 +7,6 @@
 #include <stdexcept>
 
 #include "installer/InstallerModel.h"
-#include "tests/support/CapturedStreams.h"
 #include "tests/support/Machine.h"
 #include "tests/support/ScriptedProcesses.h"
 
@@ -17,18 +16,16 @@ using Names = std::vector<std::string>;
 
 class ScriptedModelProcessesTest : public testing::Test {
 protected:
-    ScriptedModelProcessesTest() : script(ProcessScript::Renew()) {
-        HV::InstallerModel::Forget();
-        const CapturedStreams streams;
-        model = &HV::InstallerModel::Instance();
+    // The model takes a first snapshot when it is made.
+    ScriptedModelProcessesTest() {
+        EXPECT_EQ(script.snapshots, 1);
         script.snapshots = 0;
     }
-    ~ScriptedModelProcessesTest() override { HV::InstallerModel::Forget(); }
 
     void Uses(const std::vector<std::string>& hostRefs) {
         HV::PackageInfo package;
         package.hostRefs = hostRefs;
-        model->packages.push_back(package);
+        model.packages.push_back(package);
     }
 
     /// A process of every name that stands in a question, and of names that stand in none.
@@ -47,7 +44,7 @@ protected:
 
     Names Found() {
         std::vector<HV::ProcessRecord> found(1);
-        const bool any = model->FindRunningHosts(found);
+        const bool any = model.FindRunningHosts(found);
         EXPECT_EQ(any, !found.empty());
         Names names;
         std::ranges::transform(found, std::back_inserter(names), &HV::ProcessRecord::name);
@@ -55,8 +52,8 @@ protected:
     }
 
     Machine machine;
-    ProcessScript& script;
-    HV::InstallerModel* model = nullptr;
+    ProcessScript& script = ProcessScript::Renew();
+    HV::InstallerModel model{{}};
 };
 
 TEST_F(ScriptedModelProcessesTest, AsksForEachHostInItsWay) {
@@ -77,7 +74,7 @@ TEST_F(ScriptedModelProcessesTest, AsksForEachHostInItsWay) {
                                                   {"", {}}};
     int asked = 0;
     for (const auto& [hostRef, names] : answers) {
-        model->packages.clear();
+        model.packages.clear();
         Uses({hostRef});
         EXPECT_EQ(Found(), names) << hostRef;
         ++asked;
@@ -141,7 +138,7 @@ TEST_F(ScriptedModelProcessesTest, CountsHiddenAndUnneededPackagesToo) {
     package.show = false;
     package.requiresHost = false;
     package.hostRefs = {"resolve"};
-    model->packages.push_back(package);
+    model.packages.push_back(package);
     EXPECT_EQ(Found(), Names{"Resolve.exe"});
 }
 
@@ -164,10 +161,10 @@ TEST_F(ScriptedModelProcessesTest, TakesOneSnapshotForAllQuestions) {
 
 TEST_F(ScriptedModelProcessesTest, TakesASnapshotForTheManager) {
     script.Runs(R"(C:\a\Halvorn Application Manager.exe)");
-    EXPECT_TRUE(model->ManagerIsRunning());
+    EXPECT_TRUE(model.ManagerIsRunning());
     EXPECT_EQ(script.snapshots, 1);
     script.processes.clear();
-    EXPECT_FALSE(model->ManagerIsRunning());
+    EXPECT_FALSE(model.ManagerIsRunning());
     EXPECT_EQ(script.snapshots, 2);
 }
 
@@ -178,7 +175,7 @@ TEST_F(ScriptedModelProcessesTest, FindsNothingWhenTheListCannotBeHad) {
     EXPECT_EQ(Found().size(), 2U);
     script.listFails = true;
     EXPECT_EQ(Found(), Names());
-    EXPECT_FALSE(model->ManagerIsRunning());
+    EXPECT_FALSE(model.ManagerIsRunning());
 }
 
 TEST_F(ScriptedModelProcessesTest, FindsForHitFilmAProcessThatCannotBeNamed) {
@@ -186,7 +183,7 @@ TEST_F(ScriptedModelProcessesTest, FindsForHitFilmAProcessThatCannotBeNamed) {
     script.processes.push_back({.number = 4, .path = R"(C:\hidden.exe)", .showsModules = false});
     Uses({"hitfilm"});
     std::vector<HV::ProcessRecord> found;
-    EXPECT_TRUE(model->FindRunningHosts(found));
+    EXPECT_TRUE(model.FindRunningHosts(found));
     ASSERT_EQ(found.size(), 3U);
     EXPECT_THROW(static_cast<void>(HV::HostDisplayName(found[0])), std::out_of_range);
 }

@@ -184,6 +184,7 @@ void ScriptedToolkit::ExpectWindow(const HV::InstallerWindow& window) const {
 }
 
 HV::InstallerWindow* ScriptedToolkit::CreateInstallerWindow(HV::WinWizardController& controller,
+                                                            const HV::InstallerModel& /*model*/,
                                                             const std::string& caption) {
     Note("CreateInstallerWindow " + Quoted(caption));
     controller_ = &controller;
@@ -196,7 +197,8 @@ HV::InstallerWindow* ScriptedToolkit::CreateInstallerWindow(HV::WinWizardControl
     return window_.get();
 }
 
-HV::WelcomePage* ScriptedToolkit::CreateWelcomePage(HV::WinWizardController& controller, HV::InstallerWindow& window) {
+HV::WelcomePage* ScriptedToolkit::CreateWelcomePage(HV::WinWizardController& controller,
+                                                    const HV::InstallerModel& /*model*/, HV::InstallerWindow& window) {
     Note("CreateWelcomePage");
     EXPECT_EQ(&controller, controller_);
     ExpectWindow(window);
@@ -220,6 +222,7 @@ HV::SelectionPage* ScriptedToolkit::CreateSelectionPage(HV::WinWizardController&
 }
 
 HV::InstallingPage* ScriptedToolkit::CreateInstallingPage(HV::WinWizardController& controller,
+                                                          const HV::InstallerModel& /*model*/,
                                                           HV::InstallerWindow& window, const std::string& status,
                                                           int percent) {
     Note("CreateInstallingPage " + Quoted(status) + " " + std::to_string(percent));

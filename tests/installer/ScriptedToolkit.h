@@ -108,13 +108,15 @@ public:
 
     // The controller's side
 
-    HV::InstallerWindow* CreateInstallerWindow(HV::WinWizardController& controller,
+    HV::InstallerWindow* CreateInstallerWindow(HV::WinWizardController& controller, const HV::InstallerModel& model,
                                                const std::string& caption) override;
-    HV::WelcomePage* CreateWelcomePage(HV::WinWizardController& controller, HV::InstallerWindow& window) override;
+    HV::WelcomePage* CreateWelcomePage(HV::WinWizardController& controller, const HV::InstallerModel& model,
+                                       HV::InstallerWindow& window) override;
     HV::SelectionPage* CreateSelectionPage(HV::WinWizardController& controller, HV::InstallerWindow& window,
                                            const std::vector<HV::ProductItem>& items) override;
-    HV::InstallingPage* CreateInstallingPage(HV::WinWizardController& controller, HV::InstallerWindow& window,
-                                             const std::string& status, int percent) override;
+    HV::InstallingPage* CreateInstallingPage(HV::WinWizardController& controller, const HV::InstallerModel& model,
+                                             HV::InstallerWindow& window, const std::string& status,
+                                             int percent) override;
     HV::FinalPage* CreateFinalPage(HV::WinWizardController& controller, HV::InstallerWindow& window) override;
     HV::EULAWindowController* CreateEULAWindowController() override;
     void ShowAgreement(HV::EULAWindowController& viewers) override;

@@ -4,9 +4,7 @@
 #include <utility>
 #include <vector>
 
-#include "installer/InstallerModel.h"
 #include "package/HeldFile.h"
-#include "package/ValidationTable.h"
 
 namespace {
 
@@ -20,17 +18,21 @@ const std::string& Keep(const std::string& text) {
     return texts.emplace_back(text);
 }
 
-}  // namespace
-
-std::span<const HV::ValidationRow> HV::ValidationRows() {
+std::span<const HV::ValidationRow> Rows() {
     if (const auto action = std::exchange(whenAsked, nullptr)) {
         action();
     }
     return table;
 }
 
-std::span<const HV::ReleaseDigest> HV::ReleaseDigests() {
+std::span<const HV::ReleaseDigest> Digests() {
     return digests;
+}
+
+}  // namespace
+
+HV::Release SetupRelease() {
+    return {kPackages, Rows, Digests};
 }
 
 std::string InPackages(const std::string& fileName) {
@@ -40,7 +42,6 @@ std::string InPackages(const std::string& fileName) {
 SetupFolder::SetupFolder(Machine& onMachine) : machine_(onMachine) {}
 
 SetupFolder::~SetupFolder() {
-    HV::InstallerModel::Forget();
     whenAsked = nullptr;
     table.clear();
     digests.clear();

@@ -3,19 +3,22 @@
 #include <functional>
 #include <string>
 
+#include "installer/InstallerModel.h"
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
 
 constexpr const char* kPackages = R"(C:\Setup\packages)";
 
+/// The release that the setup folder of a test consists of: what SetupFolder is told goes into its tables.
+HV::Release SetupRelease();
+
 /// The path of a file in the packages folder.
 std::string InPackages(const std::string& fileName);
 
-/// What a release consists of: the packages folder beside the wizard's program, and the validation table that is
-/// compiled into it. A program that links this has the rows that the test asks for, and its wizard lies in `C:\Setup`.
+/// What SetupRelease() consists of: the packages folder of a wizard in `C:\Setup`, and the validation table by which
+/// the wizard knows it.
 ///
-/// At first the table is empty and there is no packages folder. The wizard's model is forgotten with the object. One at
-/// a time.
+/// At first the table is empty and there is no packages folder. One at a time.
 class SetupFolder {
 public:
     explicit SetupFolder(Machine& onMachine);
@@ -33,7 +36,7 @@ public:
     /// Another row of the table, and its second digest: the one of no bytes unless it is given.
     void Knows(const std::string& fileName, const std::string& md5,
                const std::string& sha256 = "e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855");
-    /// What happens, once, when the table is next asked for: behind the listing of the folder, ahead of the look at its
+    /// What happens, once, when the table is next asked for: after the listing of the folder, before the look at its
     /// packages.
     void WhenTheTableIsAsked(std::function<void()> action);
 

@@ -296,7 +296,7 @@ protected:
     Poll() {
         Ships(Product("glow"));
         Begin();
-        wizard.installingPage = toolkit.CreateInstallingPage(wizard, *wizard.window, "before", 7);
+        wizard.installingPage = toolkit.CreateInstallingPage(wizard, Model(), *wizard.window, "before", 7);
         wizard.state = WizardState::Installing;
         wizard.job = &job;
         toolkit.SetTimer(*wizard.window, HV::kProgressTimer, 333);

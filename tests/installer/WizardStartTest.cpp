@@ -31,7 +31,7 @@ TEST_F(WizardStart, NumbersItsStates) {
 
 TEST_F(WizardStart, ShowsTheFirstPageInOrder) {
     Ships(Product("glow"));
-    wizard.Initialize(7);
+    Start(7);
     const std::string caption = Model().GetString("installer.title.noversion");
     EXPECT_EQ(toolkit.calls, (std::vector<std::string>{"CreateInstallerWindow \"" + caption + "\"", "CreateWelcomePage",
                                                        "ShowWindow MainWindow 7", "SetContinueText \"Continue\""}));

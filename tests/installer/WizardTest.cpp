@@ -2,7 +2,7 @@
 
 #include "hvframework/FileUtils.h"
 
-WizardTest::WizardTest() {
+WizardTest::WizardTest() : WizardWalk(SetupRelease()) {
     ShipsSuiteWithUrl("https://www.example.com/tessaly");
 }
 

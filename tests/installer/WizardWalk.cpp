@@ -3,12 +3,11 @@
 #include <chrono>
 #include <future>
 #include <thread>
+#include <utility>
 
 #include "hvframework/FileUtils.h"
 
-WizardWalk::WizardWalk() {
-    HV::InstallerModel::Forget();
-}
+WizardWalk::WizardWalk(HV::Release release) : model_(std::move(release)) {}
 
 WizardWalk::~WizardWalk() {
     EndTheRun();
@@ -18,7 +17,6 @@ WizardWalk::~WizardWalk() {
     }
     // An install makes a folder of its machine the current one.
     fs::current_path(folder_);
-    HV::InstallerModel::Forget();
 }
 
 void WizardWalk::HasHostsOf(const std::string& sampleMachine) {
@@ -27,13 +25,25 @@ void WizardWalk::HasHostsOf(const std::string& sampleMachine) {
     machine.Loads(text);
 }
 
+HV::InstallerModel& WizardWalk::Model() {
+    if (!model_.loaded) {
+        model_.Load();
+    }
+    return model_;
+}
+
+void WizardWalk::Start(int showCommand) {
+    (void)Model();
+    wizard.Initialize(showCommand);
+}
+
 void WizardWalk::Begin() {
-    wizard.Initialize(10);
+    Start(10);
 }
 
 void WizardWalk::BeginAndEnd() {
     try {
-        wizard.Initialize(10);
+        Begin();
         ADD_FAILURE() << "the wizard goes on";
     } catch (const WizardEnded& end) {
         EXPECT_EQ(end.status, 0U);

@@ -50,14 +50,15 @@ inline ShownBox HostsRun(const std::string& text) {
 /// The run of an install is over when the test is.
 class WizardWalk : public testing::Test {
 protected:
-    WizardWalk();
+    explicit WizardWalk(HV::Release release);
     ~WizardWalk() override;
 
     void HasHostsOf(const std::string& sampleMachine);
 
     // The user's way
 
-    /// Starts the wizard, ready for the first press.
+    /// Starts the wizard, ready for the first press. It is shown as a program that is started with this command.
+    void Start(int showCommand);
     void Begin();
     /// Starts the wizard and expects the process to end with status 0 there.
     void BeginAndEnd();
@@ -78,7 +79,8 @@ protected:
     /// Presses Install, polls until the final page is there, and gives every state of the bar on the way.
     std::vector<int> InstallAndPoll();
 
-    [[nodiscard]] HV::InstallerModel& Model() const { return HV::InstallerModel::Instance(); }
+    /// The wizard's model, loaded as the start of the wizard does it.
+    [[nodiscard]] HV::InstallerModel& Model();
     [[nodiscard]] std::string Line() const { return wizard.job->commandLine; }
     /// The value of an argument of the line as the engine has read it. The run is over then.
     [[nodiscard]] std::string Argument(const std::string& key);
@@ -87,7 +89,12 @@ protected:
     LogRecorder log;
     HeldOutput output;
     ScriptedToolkit toolkit;
-    HV::WinWizardController wizard{toolkit};
+
+private:
+    HV::InstallerModel model_;
+
+protected:
+    HV::WinWizardController wizard{toolkit, model_};
 
 private:
     fs::path folder_ = fs::current_path();

@@ -1,3 +1,4 @@
+#include "installer/InstallerModel.h"
 #include "installer/WinWizardController.h"
 #include "installer/windows/InstallingPage.h"
 #include "installer/windows/WindowSystem.h"
@@ -51,8 +52,9 @@ protected:
     Machine machine;
     const HV::WindowSystem windows;
     HV::WindowsToolkit toolkit;
-    HV::WinWizardController controller{toolkit};
-    HV::InstallingPage page{controller, "Detecting host applications...", 0};
+    HV::InstallerModel model{{}};
+    HV::WinWizardController controller{toolkit, model};
+    HV::InstallingPage page{controller, model, "Detecting host applications...", 0};
 
 private:
     HWND parent_ = nullptr;

@@ -10,18 +10,16 @@
 
 #include "hvdeploy/src/DeployJob.h"
 #include "installer/windows/WizardMetrics.h"
-#include "tests/installer/SetupFolder.h"
 #include "tests/installer/windows/WindowTest.h"
 #include "tests/support/LogRecorder.h"
+#include "tests/support/Machine.h"
 
 namespace {
 
 class InstallerWindowTest : public WindowTest {
 protected:
-    InstallerWindowTest() { setup.HasSuite(); }
-
     HV::InstallerWindow& Make() {
-        window = toolkit.CreateInstallerWindow(controller, "Tessaly Suite Installer");
+        window = toolkit.CreateInstallerWindow(controller, model, "Tessaly Suite Installer");
         return *window;
     }
 
@@ -32,7 +30,6 @@ protected:
     }
 
     Machine machine;
-    SetupFolder setup{machine};
     HV::InstallerWindow* window = nullptr;  // lives until the process ends
 };
 

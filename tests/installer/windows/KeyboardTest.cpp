@@ -9,7 +9,6 @@
 #include "installer/windows/SelectionPage.h"
 #include "installer/windows/WelcomePage.h"
 #include "platform/windows/wtl.h"
-#include "tests/installer/SetupFolder.h"
 #include "tests/installer/windows/WindowTest.h"
 
 namespace {
@@ -23,8 +22,6 @@ constexpr int kAgreementItself = 0;
 /// Windows of the wizard, served by the loop that serves them in the program.
 class KeyboardTest : public WindowTest {
 protected:
-    KeyboardTest() { setup.HasSuite(); }
-
     // The key goes down and up, at whatever has the focus, and everything that follows of it is over.
     void Type(WPARAM key) {
         const HWND focus = ::GetFocus();
@@ -47,8 +44,6 @@ protected:
     }
     std::vector<int> Tab(std::size_t times) { return Press(std::vector<WPARAM>(times, VK_TAB)); }
 
-    Machine machine;
-    SetupFolder setup{machine};
     WTL::CMessageLoop loop;
 };
 
@@ -56,8 +51,8 @@ protected:
 class FirstPageKeyboardTest : public KeyboardTest {
 protected:
     FirstPageKeyboardTest() {
-        controller.window = window = toolkit.CreateInstallerWindow(controller, "Installer");
-        controller.welcomePage = toolkit.CreateWelcomePage(controller, *window);
+        controller.window = window = toolkit.CreateInstallerWindow(controller, model, "Installer");
+        controller.welcomePage = toolkit.CreateWelcomePage(controller, model, *window);
         toolkit.ShowWindow(HV::WizardPart::MainWindow, SW_SHOW);
         ::SetFocus(*window);
     }
@@ -141,7 +136,7 @@ TEST_F(FirstPageKeyboardTest, TheFocusStaysOnTheFrameThatHadIt) {
 class ProductsKeyboardTest : public KeyboardTest {
 protected:
     ProductsKeyboardTest() {
-        controller.window = toolkit.CreateInstallerWindow(controller, "Installer");
+        controller.window = toolkit.CreateInstallerWindow(controller, model, "Installer");
         std::vector<HV::ProductItem> items;
         for (int number = 0; number < 10; ++number) {
             // The third one lacks its hosts.

@@ -19,7 +19,10 @@ constexpr DWORD kPageStyle = 0x50000000;
 /// Pages over the texts that this program carries, for a suite.
 class PagesTest : public WindowTest {
 protected:
-    PagesTest() { setup.HasSuite(); }
+    PagesTest() {
+        setup.HasSuite();
+        release.Load();
+    }
 
     // Whether the page fills its background with the page's colour.
     static bool FillsItsBackground(HWND page) {
@@ -30,12 +33,13 @@ protected:
 
     Machine machine;
     SetupFolder setup{machine};
+    HV::InstallerModel release{SetupRelease()};
 };
 
 class WelcomePageTest : public PagesTest {
 protected:
     WelcomePageTest() { page.Create(Parent(), kPage, "", kPageStyle); }
-    HV::WelcomePage page{controller};
+    HV::WelcomePage page{controller, release};
 };
 
 TEST_F(WelcomePageTest, HasItsButtonsOnOneRow) {
@@ -105,7 +109,7 @@ protected:
         return AreaOf(area);
     }
 
-    HV::InstallingPage page{controller, "Detecting host applications...", 0};
+    HV::InstallingPage page{controller, release, "Detecting host applications...", 0};
 };
 
 TEST_F(InstallingPageTest, StartsAsItWasMade) {
@@ -157,7 +161,7 @@ public:
 };
 
 TEST_F(PagesTest, InstallingPageErasesWhatItPaintsAgain) {
-    CountingPage page(controller, "Detecting host applications...", 0);
+    CountingPage page(controller, release, "Detecting host applications...", 0);
     ASSERT_NE(page.Create(Parent(), kPage, "", kPageStyle), nullptr);
     ::UpdateWindow(page);
     const int before = page.erased;
@@ -171,9 +175,9 @@ TEST_F(PagesTest, InstallingPageErasesWhatItPaintsAgain) {
 }
 
 TEST_F(PagesTest, HaveNoIcon) {
-    HV::WelcomePage welcome(controller);
+    HV::WelcomePage welcome(controller, release);
     HV::SelectionPage selection(controller);
-    HV::InstallingPage installing(controller, "", 0);
+    HV::InstallingPage installing(controller, release, "", 0);
     HV::FinalPage final(controller);
     ASSERT_NE(welcome.Create(Parent(), kPage, "", kPageStyle), nullptr);
     ASSERT_NE(selection.Create(Parent(), kPage, "", kPageStyle), nullptr);

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "installer/InstallerModel.h"
 #include "installer/WinWizardController.h"
 #include "installer/windows/WindowSystem.h"
 #include "installer/windows/WindowsToolkit.h"
@@ -64,7 +65,8 @@ protected:
 
     HV::WindowSystem system;
     QuietToolkit toolkit;
-    HV::WinWizardController controller{toolkit};
+    HV::InstallerModel model{{}};  // not loaded: the windows of these tests have no texts of their release
+    HV::WinWizardController controller{toolkit, model};
 
 private:
     HWND parent_ = nullptr;

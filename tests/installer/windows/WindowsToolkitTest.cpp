@@ -6,7 +6,6 @@
 #include <vector>
 
 #include "installer/windows/InstallerWindow.h"
-#include "tests/installer/SetupFolder.h"
 #include "tests/installer/windows/WindowTest.h"
 
 namespace {
@@ -17,17 +16,14 @@ using HV::WizardPart;
 class WindowsToolkitTest : public WindowTest {
 protected:
     WindowsToolkitTest() {
-        setup.HasSuite();
-        window = toolkit.CreateInstallerWindow(controller, "Installer");
-        toolkit.CreateWelcomePage(controller, *window);
+        window = toolkit.CreateInstallerWindow(controller, model, "Installer");
+        toolkit.CreateWelcomePage(controller, model, *window);
         toolkit.ShowWindow(WizardPart::MainWindow, SW_SHOW);
     }
 
     [[nodiscard]] HWND Page() const { return ::FindWindowExW(*window, nullptr, nullptr, L""); }
     [[nodiscard]] HWND ButtonOfPage(int identifier) const { return ::GetDlgItem(Page(), identifier); }
 
-    Machine machine;
-    SetupFolder setup{machine};
     HV::InstallerWindow* window = nullptr;
 };
 
@@ -110,7 +106,7 @@ TEST_F(WindowsToolkitTest, AsksTheSelectionPage) {
 }
 
 TEST_F(WindowsToolkitTest, SetsAndTellsWhatTheInstallingPageShows) {
-    HV::InstallingPage* const page = toolkit.CreateInstallingPage(controller, *window, "first", 0);
+    HV::InstallingPage* const page = toolkit.CreateInstallingPage(controller, model, *window, "first", 0);
     EXPECT_EQ(toolkit.StatusText(*page), "first");
     toolkit.SetStatusText(*page, "second");
     toolkit.SetPercent(*page, 37);
