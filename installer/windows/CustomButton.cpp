@@ -18,19 +18,26 @@ constexpr float kPenWidth = 1.0F;
 constexpr int kTextInset = 3;
 constexpr unsigned kCentred = DT_CENTER | DT_VCENTER | DT_SINGLELINE;
 
-Gdiplus::Rect RectOf(const RECT& place) {
-    return {static_cast<INT>(place.left), static_cast<INT>(place.top), static_cast<INT>(place.right - place.left),
-            static_cast<INT>(place.bottom - place.top)};
+int WidthOf(const RECT& place) {
+    return static_cast<int>(place.right - place.left);
 }
 
-void FillBackground(Gdiplus::Graphics& graphics, CustomButtonOwner* owner, const Gdiplus::Rect& place) {
+int HeightOf(const RECT& place) {
+    return static_cast<int>(place.bottom - place.top);
+}
+
+void Fill(Gdiplus::Graphics& graphics, const Gdiplus::Brush& brush, const RECT& place) {
+    graphics.FillRectangle(&brush, static_cast<int>(place.left), static_cast<int>(place.top), WidthOf(place),
+                           HeightOf(place));
+}
+
+void FillBackground(Gdiplus::Graphics& graphics, CustomButtonOwner* owner, const RECT& place) {
     const Gdiplus::Brush* const background = owner == nullptr ? nullptr : owner->BackgroundBrush();
     if (background != nullptr) {
-        graphics.FillRectangle(background, place);
-        return;
+        return Fill(graphics, *background, place);
     }
     const Gdiplus::SolidBrush black(Gdiplus::Color(OpaqueOf(0x000000)));
-    graphics.FillRectangle(&black, place);
+    Fill(graphics, black, place);
 }
 
 // A disabled button is grey whether it is highlighted or not.
@@ -95,13 +102,12 @@ bool IsEnabled(const DRAWITEMSTRUCT& item) {
 
 void DrawButton(const CustomButton& button, const DRAWITEMSTRUCT& item) {
     const bool enabled = IsEnabled(item);
-    const Gdiplus::Rect place = RectOf(item.rcItem);
     {
         Gdiplus::Graphics graphics(item.hDC);
-        FillBackground(graphics, button.owner, place);
+        FillBackground(graphics, button.owner, item.rcItem);
         graphics.SetSmoothingMode(Gdiplus::SmoothingModeHighQuality);
         const Gdiplus::SolidBrush face(Gdiplus::Color(OpaqueOf(FaceOf(button, enabled))));
-        FillRoundedRect(graphics, face, place, kInvisible);
+        FillRoundedRect(graphics, face, item.rcItem, kInvisible);
     }
     RECT inside = item.rcItem;
     ::InflateRect(&inside, -kTextInset, -kTextInset);
@@ -110,14 +116,14 @@ void DrawButton(const CustomButton& button, const DRAWITEMSTRUCT& item) {
                     enabled ? WizardMetrics::TextColor : WizardMetrics::DisabledTextColor);
 }
 
-void FillRoundedRect(Gdiplus::Graphics& graphics, const Gdiplus::Brush& brush, const Gdiplus::Rect& place,
+void FillRoundedRect(Gdiplus::Graphics& graphics, const Gdiplus::Brush& brush, const RECT& place,
                      Gdiplus::ARGB penColor) {
     const Gdiplus::Unit unit = graphics.GetPageUnit();
     graphics.SetPageUnit(Gdiplus::UnitPixel);
     Gdiplus::Pen pen(Gdiplus::Color(penColor), kPenWidth);
     pen.SetAlignment(Gdiplus::PenAlignmentCenter);
     Gdiplus::GraphicsPath path;
-    AddRoundedRect(path, place.X, place.Y, place.Width, place.Height);
+    AddRoundedRect(path, static_cast<int>(place.left), static_cast<int>(place.top), WidthOf(place), HeightOf(place));
     graphics.FillPath(&brush, &path);
     graphics.DrawPath(&pen, &path);
     graphics.SetPageUnit(unit);

@@ -9,7 +9,7 @@
 /// appearance.
 namespace HV {
 
-/// Whoever hosts buttons answers what lies behind them.
+/// A window that has buttons says what they are drawn on.
 class CustomButtonOwner {
 public:
     virtual ~CustomButtonOwner() = default;
@@ -63,7 +63,7 @@ void MakeButton(CustomButton& button, HWND parent, const std::string& text, int 
 void DrawButton(const CustomButton& button, const DRAWITEMSTRUCT& item);
 
 /// Fills a rounded rectangle and draws its outline one pixel wide.
-void FillRoundedRect(Gdiplus::Graphics& graphics, const Gdiplus::Brush& brush, const Gdiplus::Rect& place,
+void FillRoundedRect(Gdiplus::Graphics& graphics, const Gdiplus::Brush& brush, const RECT& place,
                      Gdiplus::ARGB penColor);
 
 /// Makes `path` one rounded rectangle, which stops one pixel short of the right and bottom edges.

@@ -27,14 +27,10 @@ RECT CutToScreen(const RECT& window) {
             window.top + std::min(window.bottom - window.top, area.bottom - area.top)};
 }
 
-RECT RectOf(const Place& place) {
-    return {place.left, place.top, place.right, place.bottom};
-}
-
 ViewerPlaces PlacesIn(HWND viewer) {
     RECT frame{};
     ::GetWindowRect(viewer, &frame);
-    return PlacesInViewer(static_cast<int>(frame.right - frame.left), static_cast<int>(frame.bottom - frame.top));
+    return PlacesInViewer(frame.right - frame.left, frame.bottom - frame.top);
 }
 
 }  // namespace
@@ -104,10 +100,10 @@ void EULAWindow::OnFinalMessage(HWND) {
 
 void EULAWindow::OnCreate() {
     const ViewerPlaces places = PlacesIn(m_hWnd);
-    MakeButton(closeButton_, m_hWnd, "Close", kCloseControl, RectOf(places.closeButton));
+    MakeButton(closeButton_, m_hWnd, "Close", kCloseControl, places.closeButton);
     saveButton_.highlighted = true;
-    MakeButton(saveButton_, m_hWnd, "Save License", kSaveControl, RectOf(places.saveButton));
-    const Place& text = places.text;
+    MakeButton(saveButton_, m_hWnd, "Save License", kSaveControl, places.saveButton);
+    const RECT& text = places.text;
     richText_ =
         ::CreateWindowExW(0, L"RICHEDIT50W", L"License", kRichTextStyle, text.left, text.top, text.right - text.left,
                           text.bottom - text.top, m_hWnd, nullptr, ::GetModuleHandleW(nullptr), nullptr);

@@ -167,15 +167,14 @@ void InstallerWindow::OnCommand(WPARAM command) {
 void InstallerWindow::GrowStep() {
     RECT frame{};
     ::GetWindowRect(m_hWnd, &frame);
-    constexpr int kWidth = WizardMetrics::WideWindowRect.right - WizardMetrics::WideWindowRect.left;
-    const Growth step = Grow({static_cast<int>(frame.left), static_cast<int>(frame.right)}, kWidth);
+    constexpr LONG kWidth = WizardMetrics::WideWindowRect.right - WizardMetrics::WideWindowRect.left;
+    const Growth step = Grow(frame, kWidth);
     if (step.finished) {
         ::KillTimer(m_hWnd, kGrowTimer);
     }
     // The Close button comes into view at the right: a window that the user has moved to the side grows inwards.
-    const RECT area = ATL::WorkAreaAt(frame);
-    const Columns columns = KeptOnScreen(step.columns, {static_cast<int>(area.left), static_cast<int>(area.right)});
-    ::MoveWindow(m_hWnd, columns.left, frame.top, columns.right - columns.left, frame.bottom - frame.top, TRUE);
+    const RECT place = KeptOnScreen(step.window, ATL::WorkAreaAt(frame));
+    ::MoveWindow(m_hWnd, place.left, place.top, place.right - place.left, place.bottom - place.top, TRUE);
 }
 
 }  // namespace HV

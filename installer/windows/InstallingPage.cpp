@@ -72,7 +72,7 @@ void InstallingPage::PaintBar(HDC device) {
     }
     percent_ = std::min(percent_, 100);
     RECT filled = barRect_;
-    filled.right = filled.left + FillWidth(percent_, static_cast<int>(barRect_.right - barRect_.left));
+    filled.right = filled.left + FillWidth(percent_, barRect_.right - barRect_.left);
     ::FillRect(device, &filled, metrics.FillBrush);
 }
 

@@ -50,8 +50,7 @@ void DrawCheckButton(const ProductCheckButton& button, const DRAWITEMSTRUCT& ite
     const bool checked = ::SendMessageW(item.hwndItem, BM_GETCHECK, 0, 0) == BST_CHECKED || button.checked;
     DrawBitmap(item.hDC, checked ? on : off, item.rcItem.left, item.rcItem.top + kPictureTop);
     RECT label = item.rcItem;
-    label.left = CheckBoxLabelLeft({static_cast<int>(item.rcItem.left), static_cast<int>(item.rcItem.top),
-                                    static_cast<int>(item.rcItem.right), static_cast<int>(item.rcItem.bottom)});
+    label.left = CheckBoxLabelLeft(item.rcItem);
     ::SetBkColor(item.hDC, ColorOf(WizardMetrics::PageColor));
     DrawColoredText(item.hDC, button.displayName, label, WizardMetrics::Instance().BodyFont, kLabelFormat,
                     enabled ? WizardMetrics::TextColor : WizardMetrics::DisabledTextColor);
@@ -100,23 +99,22 @@ void SelectionPage::OnCreate() {
     MakeButton(deselectAllButton_, m_hWnd, "Deselect All", kDeselectAllControl, deselect);
     MakeButton(selectAllButton_, m_hWnd, "Select All", kSelectAllControl, select);
 
-    const Columns page{static_cast<int>(client.left), static_cast<int>(client.right)};
     const int boxes = std::min(kCheckBoxes, static_cast<int>(items_.size()));
     for (int index = 0; index < boxes; ++index) {
-        MakeCheckButton(static_cast<std::size_t>(index), CheckBoxPlace(index, page, static_cast<int>(bottom) + 25));
+        MakeCheckButton(static_cast<std::size_t>(index), CheckBoxPlace(index, client, bottom + 25));
     }
     SendMessageToDescendants(WM_SETFONT, reinterpret_cast<WPARAM>(WizardMetrics::Instance().BodyFont), FALSE);
 }
 
-void SelectionPage::MakeCheckButton(std::size_t index, const Place& place) {
+void SelectionPage::MakeCheckButton(std::size_t index, const RECT& place) {
     const ProductItem& item = items_[index];
     ProductCheckButton button;
     button.displayName = item.displayName;
     button.checked = item.checked;
     button.background = WizardMetrics::Instance().PageBrush;
-    button.handle = MakeButtonControl(
-        m_hWnd, ControlName(item.displayName), kFirstCheckControl + static_cast<int>(index),
-        {place.left, place.top, place.right, place.bottom}, item.enabled ? kCheckStyle : kDisabledCheckStyle);
+    button.handle =
+        MakeButtonControl(m_hWnd, ControlName(item.displayName), kFirstCheckControl + static_cast<int>(index), place,
+                          item.enabled ? kCheckStyle : kDisabledCheckStyle);
     SendCheck(button.handle, item.checked);
     checkButtons_.push_back(button);
 }

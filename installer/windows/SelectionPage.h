@@ -61,7 +61,7 @@ public:
 
 private:
     void OnCreate();
-    void MakeCheckButton(std::size_t index, const Place& place);
+    void MakeCheckButton(std::size_t index, const RECT& place);
     void OnPaint() const;
     [[nodiscard]] bool OnDrawItem(const DRAWITEMSTRUCT& item) const;
     void OnCommand(WPARAM command);

@@ -4,61 +4,62 @@
 
 #include <vector>
 
+#include "tests/support/Rectangles.h"
+
 namespace {
 
-using HV::Columns;
 using HV::Growth;
-using HV::Place;
+
+// A window, or a screen, with these columns.
+RECT Across(LONG left, LONG right) {
+    return {left, 20, right, 450};
+}
 
 // The widths that a window passes on its way.
-std::vector<int> Widths(Columns window, int width) {
-    std::vector<int> passed;
+std::vector<LONG> Widths(RECT window, LONG width) {
+    std::vector<LONG> passed;
     Growth step;
     do {
         step = HV::Grow(window, width);
-        window = step.columns;
+        window = step.window;
         passed.push_back(window.right - window.left);
     } while (!step.finished && passed.size() < 100);
     return passed;
 }
 
 TEST(Grow, TakesFourStepsFrom600To800) {
-    EXPECT_EQ(Widths({212, 812}, 800), (std::vector<int>{650, 700, 750, 800}));
+    EXPECT_EQ(Widths(Across(212, 812), 800), (std::vector<LONG>{650, 700, 750, 800}));
 }
 
 TEST(Grow, MovesBothSidesEvenly) {
-    const Growth step = HV::Grow({200, 800}, 800);
-    EXPECT_EQ(step.columns.left, 175);
-    EXPECT_EQ(step.columns.right, 825);
+    const Growth step = HV::Grow(Across(200, 800), 800);
+    EXPECT_EQ(step.window, Across(175, 825));
     EXPECT_FALSE(step.finished);
 }
 
 TEST(Grow, EndsAtTheWidthItself) {
-    const Growth step = HV::Grow({100, 850}, 800);
-    EXPECT_EQ(step.columns.left, 75);
-    EXPECT_EQ(step.columns.right, 875);
+    const Growth step = HV::Grow(Across(100, 850), 800);
+    EXPECT_EQ(step.window, Across(75, 875));
     EXPECT_TRUE(step.finished);
 }
 
 TEST(Grow, TakesAnEvenOvershootBackOnBothSides) {
     // 790 grows to 840, 40 too many.
-    const Growth step = HV::Grow({100, 890}, 800);
-    EXPECT_EQ(step.columns.left, 95);
-    EXPECT_EQ(step.columns.right, 895);
+    const Growth step = HV::Grow(Across(100, 890), 800);
+    EXPECT_EQ(step.window, Across(95, 895));
     EXPECT_TRUE(step.finished);
 }
 
 TEST(Grow, TakesAnOvershootOfOneFromTheLeftAlone) {
-    const Growth step = HV::Grow({100, 851}, 800);
-    EXPECT_EQ(step.columns.left, 76);
-    EXPECT_EQ(step.columns.right, 876);
+    const Growth step = HV::Grow(Across(100, 851), 800);
+    EXPECT_EQ(step.window, Across(76, 876));
     EXPECT_TRUE(step.finished);
 }
 
 TEST(Grow, EndsAtExactlyTheWidthFromAnyWidth) {
     int rounds = 0;
     for (int width = 600; width <= 900; ++width) {
-        const std::vector<int> passed = Widths({-30, -30 + width}, 800);
+        const std::vector<LONG> passed = Widths(Across(-30, -30 + width), 800);
         EXPECT_EQ(passed.back(), 800) << "from " << width;
         ++rounds;
     }
@@ -68,9 +69,8 @@ TEST(Grow, EndsAtExactlyTheWidthFromAnyWidth) {
 TEST(Grow, LeavesAnOddColumnOnTheRight) {
     int rounds = 0;
     for (int over = 1; over < 50; over += 2) {
-        const Growth step = HV::Grow({0, 750 + over}, 800);
-        EXPECT_EQ(step.columns.left, -25 + over / 2 + 1) << over;
-        EXPECT_EQ(step.columns.right, 775 + over - over / 2) << over;
+        const Growth step = HV::Grow(Across(0, 750 + over), 800);
+        EXPECT_EQ(step.window, Across(-25 + over / 2 + 1, 775 + over - over / 2)) << over;
         ++rounds;
     }
     EXPECT_EQ(rounds, 25);
@@ -99,7 +99,7 @@ TEST(FillWidth, IsTheWholeBarAtAHundredAndAbove) {
 TEST(CheckBoxPlace, RunsDownTwoColumnsOfSix) {
     int boxes = 0;
     for (int index = 0; index < HV::kCheckBoxes; ++index) {
-        const Place box = HV::CheckBoxPlace(index, {0, 410}, 80);
+        const RECT box = HV::CheckBoxPlace(index, {0, 0, 410, 308}, 80);
         EXPECT_EQ(box.left, index < 6 ? 10 : 196) << index;
         EXPECT_EQ(box.right - box.left, 185) << index;
         EXPECT_EQ(box.top, 80 + index % 6 * 22) << index;
@@ -110,7 +110,7 @@ TEST(CheckBoxPlace, RunsDownTwoColumnsOfSix) {
 }
 
 TEST(CheckBoxPlace, FollowsThePage) {
-    const Place box = HV::CheckBoxPlace(7, {100, 311}, 5);
+    const RECT box = HV::CheckBoxPlace(7, {100, 0, 311, 308}, 5);
     EXPECT_EQ(box.left, 100 + 10 + 85 + 1);
     EXPECT_EQ(box.right, box.left + 85);
     EXPECT_EQ(box.top, 27);
@@ -134,55 +134,46 @@ TEST(CornerDiameter, IsTheSmallerSideOfATinyRectangle) {
 }
 
 TEST(KeptOnScreen, LeavesAWindowThatIsInSight) {
-    const Columns kept = HV::KeptOnScreen({112, 912}, {0, 1024});
-    EXPECT_EQ(kept.left, 112);
-    EXPECT_EQ(kept.right, 912);
+    EXPECT_EQ(HV::KeptOnScreen(Across(112, 912), Across(0, 1024)), Across(112, 912));
 }
 
 TEST(KeptOnScreen, MovesAWindowInFromBothSides) {
-    EXPECT_EQ(HV::KeptOnScreen({-60, 590}, {0, 1024}).left, 0);
-    EXPECT_EQ(HV::KeptOnScreen({-60, 590}, {0, 1024}).right, 650);
-    EXPECT_EQ(HV::KeptOnScreen({500, 1150}, {100, 1024}).left, 374);
-    EXPECT_EQ(HV::KeptOnScreen({500, 1150}, {100, 1024}).right, 1024);
+    EXPECT_EQ(HV::KeptOnScreen(Across(-60, 590), Across(0, 1024)), Across(0, 650));
+    EXPECT_EQ(HV::KeptOnScreen(Across(500, 1150), Across(100, 1024)), Across(374, 1024));
 }
 
 TEST(KeptOnScreen, KeepsTheRightEndOfAWindowThatDoesNotFit) {
-    const Columns kept = HV::KeptOnScreen({0, 800}, {0, 640});
-    EXPECT_EQ(kept.left, -160);
-    EXPECT_EQ(kept.right, 640);
+    EXPECT_EQ(HV::KeptOnScreen(Across(0, 800), Across(0, 640)), Across(-160, 640));
 }
 
-void ExpectPlace(const Place& place, const Place& expected) {
-    EXPECT_EQ(place.left, expected.left);
-    EXPECT_EQ(place.top, expected.top);
-    EXPECT_EQ(place.right, expected.right);
-    EXPECT_EQ(place.bottom, expected.bottom);
+TEST(KeptOnScreen, LeavesTheRowsOfAWindowAlone) {
+    EXPECT_EQ(HV::KeptOnScreen({-60, -5, 590, 425}, {0, 0, 1024, 400}), (RECT{0, -5, 650, 425}));
 }
 
 TEST(PlacesInViewer, AreThoseOfTheDesignInAWholeViewer) {
     const HV::ViewerPlaces places = HV::PlacesInViewer(560, 640);
-    ExpectPlace(places.closeButton, {350, 565, 430, 590});
-    ExpectPlace(places.saveButton, {440, 565, 520, 590});
-    ExpectPlace(places.text, {30, 50, 510, 545});
+    EXPECT_EQ(places.closeButton, (RECT{350, 565, 430, 590}));
+    EXPECT_EQ(places.saveButton, (RECT{440, 565, 520, 590}));
+    EXPECT_EQ(places.text, (RECT{30, 50, 510, 545}));
 }
 
 TEST(PlacesInViewer, KeepTheButtonsAtTheLowerEdgeOfALowViewer) {
     const HV::ViewerPlaces places = HV::PlacesInViewer(560, 576);
-    ExpectPlace(places.closeButton, {350, 501, 430, 526});
-    ExpectPlace(places.saveButton, {440, 501, 520, 526});
-    ExpectPlace(places.text, {30, 50, 510, 481});
+    EXPECT_EQ(places.closeButton, (RECT{350, 501, 430, 526}));
+    EXPECT_EQ(places.saveButton, (RECT{440, 501, 520, 526}));
+    EXPECT_EQ(places.text, (RECT{30, 50, 510, 481}));
 }
 
 TEST(PlacesInViewer, KeepTheButtonsAtTheRightEdgeOfANarrowViewer) {
     const HV::ViewerPlaces places = HV::PlacesInViewer(480, 640);
-    ExpectPlace(places.closeButton, {270, 565, 350, 590});
-    ExpectPlace(places.saveButton, {360, 565, 440, 590});
-    ExpectPlace(places.text, {30, 50, 430, 545});
+    EXPECT_EQ(places.closeButton, (RECT{270, 565, 350, 590}));
+    EXPECT_EQ(places.saveButton, (RECT{360, 565, 440, 590}));
+    EXPECT_EQ(places.text, (RECT{30, 50, 430, 545}));
 }
 
 TEST(PlacesInViewer, NeverTurnTheTextInsideOut) {
     const HV::ViewerPlaces places = HV::PlacesInViewer(40, 80);
-    ExpectPlace(places.text, {30, 50, 30, 50});
+    EXPECT_EQ(places.text, (RECT{30, 50, 30, 50}));
 }
 
 }  // namespace

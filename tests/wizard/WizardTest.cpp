@@ -174,14 +174,6 @@ bool WizardTest::IsRegistered() const {
     return Registry().find(R"(CurrentVersion\Uninstall\)") != std::string::npos;
 }
 
-bool operator==(const RECT& one, const RECT& other) {
-    return one.left == other.left && one.top == other.top && one.right == other.right && one.bottom == other.bottom;
-}
-
-std::ostream& operator<<(std::ostream& out, const RECT& part) {
-    return out << "(" << part.left << ", " << part.top << ") to (" << part.right << ", " << part.bottom << ")";
-}
-
 const std::vector<std::string>& ProductNames() {
     static const std::vector<std::string> names = {
         "Tessaly Denoise",    "Tessaly Glow",   "Tessaly Grain",  "Tessaly Keyer",       "Tessaly Preset Collection",

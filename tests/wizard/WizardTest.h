@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "tests/support/Machine.h"
+#include "tests/support/Rectangles.h"
 #include "tests/wizard/CommandGate.h"
 #include "tests/wizard/RunningWizard.h"
 
@@ -86,9 +87,6 @@ private:
     std::unique_ptr<Machine> machine_;
     std::unique_ptr<CommandGate> gate_;
 };
-
-bool operator==(const RECT& one, const RECT& other);
-std::ostream& operator<<(std::ostream& out, const RECT& part);
 
 /// The products that the selection page offers, in its order.
 const std::vector<std::string>& ProductNames();

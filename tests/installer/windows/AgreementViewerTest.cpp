@@ -55,7 +55,7 @@ TEST_F(AgreementViewerTest, HasItsControls) {
     EXPECT_EQ(controls[0], (Control{161, L"Button", L"Close", {350, 565, 430, 590}, 0x5001000B}));
     EXPECT_EQ(controls[1], (Control{1184, L"Button", L"Save License", {440, 565, 520, 590}, 0x5001000B}));
     EXPECT_EQ(controls[2].identifier, 0);
-    EXPECT_EQ(controls[2].place, (Area{30, 50, 510, 545}));
+    EXPECT_EQ(controls[2].place, (RECT{30, 50, 510, 545}));
     EXPECT_EQ(controls[2].style, 0x50A10844U);
 }
 

@@ -62,12 +62,12 @@ TEST(WizardMetrics, HasFontsOfLineHeightsAndNothingElse) {
 }
 
 TEST(WizardMetrics, HasTheRectanglesOfTheHouse) {
-    EXPECT_EQ(AreaOf(WizardMetrics::WindowRect), (Area{0, 0, 600, 430}));
-    EXPECT_EQ(AreaOf(WizardMetrics::BannerRect), (Area{0, 0, 160, 350}));
-    EXPECT_EQ(AreaOf(WizardMetrics::PageRect), (Area{170, 37, 580, 345}));
-    EXPECT_EQ(AreaOf(WizardMetrics::BottomRect), (Area{0, 350, 600, 430}));
-    EXPECT_EQ(AreaOf(WizardMetrics::WideWindowRect), (Area{0, 0, 800, 430}));
-    EXPECT_EQ(AreaOf(WizardMetrics::FinalRect), (Area{0, 0, 800, 350}));
+    EXPECT_EQ(WizardMetrics::WindowRect, (RECT{0, 0, 600, 430}));
+    EXPECT_EQ(WizardMetrics::BannerRect, (RECT{0, 0, 160, 350}));
+    EXPECT_EQ(WizardMetrics::PageRect, (RECT{170, 37, 580, 345}));
+    EXPECT_EQ(WizardMetrics::BottomRect, (RECT{0, 350, 600, 430}));
+    EXPECT_EQ(WizardMetrics::WideWindowRect, (RECT{0, 0, 800, 430}));
+    EXPECT_EQ(WizardMetrics::FinalRect, (RECT{0, 0, 800, 350}));
     EXPECT_EQ(WizardMetrics::ButtonHeight, 25);
     EXPECT_EQ(WizardMetrics::TitleHeight, 32);
     EXPECT_EQ(WizardMetrics::ProgressHeight, 12);

@@ -103,10 +103,10 @@ protected:
     }
 
     // The part of the page that is to be painted.
-    [[nodiscard]] Area ToBePainted() const {
+    [[nodiscard]] RECT ToBePainted() const {
         RECT area{};
         ::GetUpdateRect(page, &area, FALSE);
-        return AreaOf(area);
+        return area;
     }
 
     HV::InstallingPage page{controller, release, "Detecting host applications...", 0};
@@ -121,13 +121,13 @@ TEST_F(InstallingPageTest, StartsAsItWasMade) {
 TEST_F(InstallingPageTest, PaintsTheBarAloneForAPercent) {
     page.SetPercent(50);
     EXPECT_EQ(page.Percent(), 50);
-    EXPECT_EQ(ToBePainted(), (Area{0, 76, 390, 88}));
+    EXPECT_EQ(ToBePainted(), (RECT{0, 76, 390, 88}));
 }
 
 TEST_F(InstallingPageTest, PaintsTheStatusAloneForAText) {
     page.SetStatusText("Installing packages...");
     EXPECT_EQ(page.StatusText(), "Installing packages...");
-    EXPECT_EQ(ToBePainted(), (Area{1, 94, 370, 113}));
+    EXPECT_EQ(ToBePainted(), (RECT{1, 94, 370, 113}));
 }
 
 TEST_F(InstallingPageTest, StoresAHundredForMoreWhenItPaints) {

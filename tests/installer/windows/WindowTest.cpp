@@ -27,18 +27,10 @@ BOOL CALLBACK DestroyOwn(HWND window, LPARAM) {
 
 }  // namespace
 
-std::ostream& operator<<(std::ostream& stream, const Area& area) {
-    return stream << "(" << area.left << ", " << area.top << ") to (" << area.right << ", " << area.bottom << ")";
-}
-
 std::ostream& operator<<(std::ostream& stream, const Control& control) {
     stream << control.identifier << " " << std::string(control.kind.begin(), control.kind.end()) << " \"";
     stream << std::string(control.text.begin(), control.text.end()) << "\" " << control.place;
     return stream << " style " << std::hex << control.style << std::dec;
-}
-
-Area AreaOf(const RECT& rect) {
-    return {rect.left, rect.top, rect.right, rect.bottom};
 }
 
 std::vector<Control> ControlsOf(HWND parent) {
@@ -48,10 +40,10 @@ std::vector<Control> ControlsOf(HWND parent) {
         RECT place{};
         ::GetWindowRect(window, &place);
         ::MapWindowPoints(nullptr, parent, reinterpret_cast<POINT*>(&place), 2);
-        controls.push_back({::GetDlgCtrlID(window), ClassName(window), TextOf(window), AreaOf(place),
+        controls.push_back({::GetDlgCtrlID(window), ClassName(window), TextOf(window), place,
                             static_cast<DWORD>(::GetWindowLongW(window, GWL_STYLE))});
     }
-    // A new child stands behind those before it.
+    // A new child stands below those before it.
     return controls;
 }
 
@@ -110,10 +102,10 @@ int Canvas::Count(unsigned rgb) const {
                                           [rgb](unsigned point) { return (point & kColours) == rgb; }));
 }
 
-bool Canvas::IsFilled(const Area& area, unsigned rgb) const {
+bool Canvas::IsFilled(const RECT& area, unsigned rgb) const {
     bool filled = area.left < area.right && area.top < area.bottom;
-    for (long y = area.top; y < area.bottom; ++y) {
-        for (long x = area.left; x < area.right; ++x) {
+    for (LONG y = area.top; y < area.bottom; ++y) {
+        for (LONG x = area.left; x < area.right; ++x) {
             filled = filled && At(static_cast<int>(x), static_cast<int>(y)) == rgb;
         }
     }

@@ -10,6 +10,7 @@
 #include "installer/windows/WindowSystem.h"
 #include "installer/windows/WindowsToolkit.h"
 #include "platform/windows/window.h"
+#include "tests/support/Rectangles.h"
 
 /// The real toolkit, but for what would wait for a user or end the test.
 class QuietToolkit : public HV::WindowsToolkit {
@@ -21,23 +22,12 @@ public:
     std::vector<std::string> urls;
 };
 
-/// A rectangle that prints itself.
-struct Area {
-    long left = 0;
-    long top = 0;
-    long right = 0;
-    long bottom = 0;
-    bool operator==(const Area&) const = default;
-};
-std::ostream& operator<<(std::ostream& stream, const Area& area);
-Area AreaOf(const RECT& rect);
-
 /// A control as its parent sees it.
 struct Control {
     int identifier = 0;
     std::wstring kind;  // the name of its class
     std::wstring text;
-    Area place;
+    RECT place{};
     DWORD style = 0;
     bool operator==(const Control&) const = default;
 };
@@ -86,7 +76,7 @@ public:
     /// How many points have this colour.
     [[nodiscard]] int Count(unsigned rgb) const;
     /// Whether every point of the area has this colour.
-    [[nodiscard]] bool IsFilled(const Area& area, unsigned rgb) const;
+    [[nodiscard]] bool IsFilled(const RECT& area, unsigned rgb) const;
 
 private:
     int width_;

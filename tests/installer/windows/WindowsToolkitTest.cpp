@@ -29,17 +29,17 @@ protected:
 
 TEST_F(WindowsToolkitTest, PutsPagesAsChildrenAtTheirPlace) {
     const Control page = ControlsOf(*window).front();
-    EXPECT_EQ(page.place, (Area{170, 37, 580, 345}));
+    EXPECT_EQ(page.place, (RECT{170, 37, 580, 345}));
     EXPECT_EQ(page.style, 0x50000000U);
     RECT client{};
     ::GetClientRect(Page(), &client);
-    EXPECT_EQ(AreaOf(client), (Area{0, 0, 410, 308}));
+    EXPECT_EQ(client, (RECT{0, 0, 410, 308}));
 }
 
 TEST_F(WindowsToolkitTest, PutsTheFinalPageOverTheWholeWindowAndFourRowsMore) {
     toolkit.CreateFinalPage(controller, *window);
     const Control page = ControlsOf(*window).front();
-    EXPECT_EQ(page.place, (Area{0, 0, 800, 354}));
+    EXPECT_EQ(page.place, (RECT{0, 0, 800, 354}));
     EXPECT_EQ(page.style, 0x50000000U);
 }
 
