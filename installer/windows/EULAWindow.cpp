@@ -4,19 +4,14 @@
 
 #include "installer/WizardArithmetic.h"
 #include "installer/windows/EULAWindowController.h"
-#include "installer/windows/Painting.h"
 #include "installer/windows/WizardMetrics.h"
 
 namespace HV {
 
 namespace {
 
-constexpr int kIcon = 129;
 constexpr int kAgreement = 137;
-constexpr DWORD kStyle = 0x00C80000;  // caption and system menu: no resizing
 constexpr RECT kWindowRect{0, 0, kViewerWidth, kViewerHeight};
-constexpr int kCloseControl = 161;
-constexpr int kSaveControl = 1184;
 constexpr DWORD kRichTextStyle = 0x50A10844;
 constexpr LONG kInset = 10;
 
@@ -49,48 +44,8 @@ std::string LoadAgreementText() {
 
 EULAWindow::EULAWindow(EULAWindowController& controller) : controller_(controller) {}
 
-ATL::CWndClassInfo& EULAWindow::GetWndClassInfo() {
-    static ATL::CWndClassInfo info{kIcon};
-    return info;
-}
-
 bool EULAWindow::CreateCentered() {
-    if (Create(nullptr, CutToScreen(kWindowRect), "Halvorn Software License", kStyle) == nullptr) {
-        return false;
-    }
-    CenterWindow();
-    return true;
-}
-
-BOOL EULAWindow::ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) {
-    switch (message) {
-        case WM_CREATE:
-            OnCreate();
-            return TRUE;
-        case WM_ERASEBKGND:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry handles as numbers.
-            FillClient(window, reinterpret_cast<HDC>(wParam), WizardMetrics::Instance().LightBrush);
-            result = TRUE;
-            return TRUE;
-        case WM_PAINT: {
-            const PaintDevice nothing(window);
-            return TRUE;
-        }
-        case WM_ACTIVATE:
-            return focus_.OnActivate(window, wParam) ? TRUE : FALSE;
-        case WM_CLOSE:
-            ::DestroyWindow(window);
-            return TRUE;
-        case WM_DRAWITEM:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry pointers as numbers.
-            result = OnDrawItem(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam)) ? TRUE : FALSE;
-            return result != FALSE;
-        case WM_COMMAND:
-            OnCommand(wParam);
-            return TRUE;
-        default:
-            return FALSE;
-    }
+    return WizardFrame::CreateCentered("Halvorn Software License", CutToScreen(kWindowRect));
 }
 
 void EULAWindow::OnFinalMessage(HWND) {
@@ -100,9 +55,9 @@ void EULAWindow::OnFinalMessage(HWND) {
 
 void EULAWindow::OnCreate() {
     const ViewerPlaces places = PlacesIn(m_hWnd);
-    MakeButton(closeButton_, m_hWnd, "Close", kCloseControl, places.closeButton);
+    MakeButton(closeButton_, m_hWnd, "Close", kCloseViewerControl, places.closeButton);
     saveButton_.highlighted = true;
-    MakeButton(saveButton_, m_hWnd, "Save License", kSaveControl, places.saveButton);
+    MakeButton(saveButton_, m_hWnd, "Save License", kSaveLicenseControl, places.saveButton);
     const RECT& text = places.text;
     richText_ =
         ::CreateWindowExW(0, L"RICHEDIT50W", L"License", kRichTextStyle, text.left, text.top, text.right - text.left,
@@ -132,25 +87,28 @@ void EULAWindow::ShowText() const {
                    reinterpret_cast<LPARAM>(agreementText_.c_str()));
 }
 
-bool EULAWindow::OnDrawItem(const DRAWITEMSTRUCT& item) const {
-    if (item.CtlID != kCloseControl && item.CtlID != kSaveControl) {
-        return false;
-    }
-    DrawButton(item.CtlID == kCloseControl ? closeButton_ : saveButton_, item);
-    return true;
+void EULAWindow::OnErase(HDC device) const {
+    FillClient(m_hWnd, device, WizardMetrics::Instance().LightBrush);
 }
 
-void EULAWindow::OnCommand(WPARAM command) {
-    if (!IsPress(command)) {
-        // The text has notifications of its own.
-        return;
+const CustomButton* EULAWindow::ButtonForId(int identifier) const {
+    switch (identifier) {
+        case kCloseViewerControl:
+            return &closeButton_;
+        case kSaveLicenseControl:
+            return &saveButton_;
+        default:
+            return nullptr;
     }
-    switch (LOWORD(command)) {
-        case kCloseControl:
+}
+
+void EULAWindow::OnPress(int identifier) {
+    switch (identifier) {
+        case kCloseViewerControl:
         case IDCANCEL:  // the Escape key
             ::DestroyWindow(m_hWnd);
             return;
-        case kSaveControl:
+        case kSaveLicenseControl:
             controller_.SaveAgreement(agreementText_, *this);
             return;
         default:

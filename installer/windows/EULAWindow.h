@@ -3,17 +3,22 @@
 #include <string>
 
 #include "installer/windows/CustomButton.h"
-#include "installer/windows/FocusMemory.h"
-#include "platform/windows/atl.h"
+#include "installer/windows/WizardWindow.h"
 
 namespace HV {
 
 class EULAWindowController;
 
+/// The identifiers of the viewer's buttons.
+enum ViewerControl : int {
+    kCloseViewerControl = 161,
+    kSaveLicenseControl = 1184,
+};
+
 /// A viewer of the licence agreement: a window of its own, beside the wizard and independent of it.
 ///
 /// Made with new; it deletes itself when the user has closed it.
-class EULAWindow : public ATL::CWindowImpl<EULAWindow> {
+class EULAWindow : public WizardFrame<EULAWindow> {
 public:
     /// `controller` is not owned and must outlive the window. Its text is the one that this program carries.
     explicit EULAWindow(EULAWindowController& controller);
@@ -22,24 +27,23 @@ public:
     /// there.
     [[nodiscard]] bool CreateCentered();
 
-    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~EULAWindow() override = default;
     void OnFinalMessage(HWND window) override;
 
-    static ATL::CWndClassInfo& GetWndClassInfo();
-
 private:
+    friend WizardWindow;
+
     void OnCreate();
     void InsetText() const;
     void ShowText() const;
-    [[nodiscard]] bool OnDrawItem(const DRAWITEMSTRUCT& item) const;
-    void OnCommand(WPARAM command);
+    void OnErase(HDC device) const;
+    [[nodiscard]] const CustomButton* ButtonForId(int identifier) const;
+    void OnPress(int identifier);
 
     // Fixed (contracts, wizard): without an owner, so the corners of these buttons are black.
     CustomButton closeButton_;
     CustomButton saveButton_;
     HWND richText_ = nullptr;
-    FocusMemory focus_;
     EULAWindowController& controller_;
     std::string agreementText_;  // as the program carries it
 };

@@ -1,7 +1,5 @@
 #include "installer/windows/FinalPage.h"
 
-#include "installer/windows/Painting.h"
-
 namespace HV {
 
 namespace {
@@ -16,26 +14,13 @@ FinalPage::~FinalPage() {
     ::DeleteObject(picture_);
 }
 
-ATL::CWndClassInfo& FinalPage::GetWndClassInfo() {
-    static ATL::CWndClassInfo info;
-    return info;
+void FinalPage::OnCreate() {
+    picture_ = LoadOwnBitmap(kPicture);
 }
 
-BOOL FinalPage::ProcessWindowMessage(HWND window, UINT message, WPARAM, LPARAM, LRESULT& result) {
-    switch (message) {
-        case WM_CREATE:
-            picture_ = LoadOwnBitmap(kPicture);
-            return TRUE;
-        case WM_ERASEBKGND:
-            // Nothing: the picture covers the page, and the rows below it show the main window's colour.
-            result = TRUE;
-            return TRUE;
-        case WM_PAINT:
-            DrawBitmap(PaintDevice(window), picture_, 0, 0);
-            return TRUE;
-        default:
-            return FALSE;
-    }
+// The picture covers the page, and the rows below it show the main window's colour.
+void FinalPage::OnPaint(HDC device) const {
+    DrawBitmap(device, picture_, 0, 0);
 }
 
 }  // namespace HV

@@ -1,23 +1,25 @@
 #pragma once
 
-#include "platform/windows/atl.h"
+#include "installer/windows/WizardWindow.h"
 
 namespace HV {
 
 class WinWizardController;
 
 /// The last page: a picture. The buttons under it are the main window's.
-class FinalPage : public ATL::CWindowImpl<FinalPage> {
+class FinalPage : public WizardWindow<FinalPage> {
 public:
     /// `controller` is not owned.
     explicit FinalPage(WinWizardController& controller);
 
-    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~FinalPage() override;
 
-    static ATL::CWndClassInfo& GetWndClassInfo();
-
 private:
+    friend WizardWindow;
+
+    void OnCreate();
+    void OnPaint(HDC device) const;
+
     HBITMAP picture_ = nullptr;
     [[maybe_unused]] WinWizardController& controller_;  // a page without buttons has nothing to ask it
 };

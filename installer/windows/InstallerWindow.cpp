@@ -3,16 +3,13 @@
 #include "installer/InstallerModel.h"
 #include "installer/WinWizardController.h"
 #include "installer/WizardArithmetic.h"
-#include "installer/windows/Painting.h"
 #include "installer/windows/WizardMetrics.h"
 
 namespace HV {
 
 namespace {
 
-constexpr int kIcon = 129;
 constexpr int kBanner = 134;
-constexpr DWORD kStyle = 0x00C80000;  // caption and system menu: no resizing, no minimise or maximise box
 constexpr int kButtonTop = 358;
 constexpr unsigned kTitleFormat = DT_SINGLELINE | DT_BOTTOM;
 
@@ -28,58 +25,11 @@ InstallerWindow::~InstallerWindow() {
     ::DeleteObject(banner_);
 }
 
-ATL::CWndClassInfo& InstallerWindow::GetWndClassInfo() {
-    static ATL::CWndClassInfo info{kIcon};
-    return info;
-}
-
 bool InstallerWindow::CreateCentered(const std::string& caption) {
-    if (Create(nullptr, WizardMetrics::WindowRect, caption, kStyle) == nullptr) {
-        return false;
-    }
-    CenterWindow();
-    return true;
+    return WizardFrame::CreateCentered(caption, WizardMetrics::WindowRect);
 }
 
-BOOL InstallerWindow::ProcessWindowMessage(HWND, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) {
-    switch (message) {
-        case WM_CREATE:
-            CreateButtons();
-            return TRUE;
-        case WM_ACTIVATE:
-            return focus_.OnActivate(m_hWnd, wParam) ? TRUE : FALSE;
-        case WM_CLOSE:
-            // Ends the run without raising the engine's cancel, even during an install. The Cancel button raises it;
-            // the difference is intended.
-            ::DestroyWindow(m_hWnd);
-            return TRUE;
-        case WM_DESTROY:
-            ::PostQuitMessage(0);
-            return TRUE;
-        case WM_ERASEBKGND:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry handles as numbers.
-            OnErase(reinterpret_cast<HDC>(wParam));
-            result = TRUE;
-            return TRUE;
-        case WM_PAINT:
-            OnPaint();
-            return TRUE;
-        case WM_DRAWITEM:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry pointers as numbers.
-            result = OnDrawItem(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam)) ? TRUE : FALSE;
-            return result != FALSE;
-        case WM_TIMER:
-            OnTimer(wParam);
-            return TRUE;
-        case WM_COMMAND:
-            OnCommand(wParam);
-            return TRUE;
-        default:
-            return FALSE;
-    }
-}
-
-CustomButton* InstallerWindow::ButtonForId(int identifier) {
+const CustomButton* InstallerWindow::ButtonForId(int identifier) const {
     switch (identifier) {
         case kContinueCommand:
             return &continueButton;
@@ -98,11 +48,11 @@ CustomButton* InstallerWindow::ButtonForId(int identifier) {
     }
 }
 
-void InstallerWindow::CreateButtons() {
+void InstallerWindow::OnCreate() {
     MakeBottomButton(continueButton, "Continue", kContinueCommand, 495, 575, kDisabledButtonStyle);
     MakeBottomButton(backButton, "Back", kBackCommand, 405, 485, kDisabledButtonStyle);
     MakeBottomButton(cancelButton, "Cancel", kCancelCommand, 195, 275, kButtonStyle);
-    SendMessageToDescendants(WM_SETFONT, reinterpret_cast<WPARAM>(WizardMetrics::Instance().BodyFont), FALSE);
+    SetFontOfControls();
 }
 
 void InstallerWindow::ShowFinalButtons() {
@@ -112,7 +62,7 @@ void InstallerWindow::ShowFinalButtons() {
     MakeBottomButton(whatsNewButton, "What's New...", kWhatsNewCommand, 145, 275, kButtonStyle);
     MakeBottomButton(resourcesButton, "Resources...", kResourcesCommand, 280, 410, kButtonStyle);
     MakeBottomButton(closeButton, "Close", kCloseCommand, 645, 775, kButtonStyle);
-    SendMessageToDescendants(WM_SETFONT, reinterpret_cast<WPARAM>(WizardMetrics::Instance().BodyFont), FALSE);
+    SetFontOfControls();
 }
 
 void InstallerWindow::MakeBottomButton(CustomButton& button, const std::string& text, int identifier, int left,
@@ -132,8 +82,7 @@ void InstallerWindow::OnErase(HDC device) const {
     ::FillRect(device, &strip, metrics.BarBrush);
 }
 
-void InstallerWindow::OnPaint() const {
-    const PaintDevice device(m_hWnd);
+void InstallerWindow::OnPaint(HDC device) const {
     DrawBitmap(device, banner_, 0, 0);
     RECT line = GetClientRect();
     line.left += WizardMetrics::PageRect.left;
@@ -141,12 +90,25 @@ void InstallerWindow::OnPaint() const {
     DrawPageText(device, title_, line, WizardMetrics::Instance().TitleFont, kTitleFormat);
 }
 
-bool InstallerWindow::OnDrawItem(const DRAWITEMSTRUCT& item) {
-    const CustomButton* const button = ButtonForId(static_cast<int>(item.CtlID));
-    if (button != nullptr) {
-        DrawButton(*button, item);
+void InstallerWindow::OnPress(int identifier) {
+    if (ButtonForId(identifier) != nullptr) {
+        controller_.Perform(identifier);
     }
-    return button != nullptr;
+}
+
+bool InstallerWindow::OnOther(UINT message, WPARAM wParam) {
+    switch (message) {
+        case WM_DESTROY:
+            // The close box in the title bar leads here. It does not raise the engine's cancel, even during an install,
+            // as the Cancel button does; the difference is intended.
+            ::PostQuitMessage(0);
+            return true;
+        case WM_TIMER:
+            OnTimer(wParam);
+            return true;
+        default:
+            return WizardFrame::OnOther(message, wParam);
+    }
 }
 
 void InstallerWindow::OnTimer(WPARAM timer) {
@@ -154,13 +116,6 @@ void InstallerWindow::OnTimer(WPARAM timer) {
         controller_.OnProgressTimer();
     } else if (timer == kGrowTimer) {
         GrowStep();
-    }
-}
-
-void InstallerWindow::OnCommand(WPARAM command) {
-    const int identifier = LOWORD(command);
-    if (IsPress(command) && ButtonForId(identifier) != nullptr) {
-        controller_.Perform(identifier);
     }
 }
 

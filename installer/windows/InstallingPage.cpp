@@ -5,7 +5,6 @@
 
 #include "installer/InstallerModel.h"
 #include "installer/WizardArithmetic.h"
-#include "installer/windows/Painting.h"
 #include "installer/windows/WizardMetrics.h"
 
 namespace HV {
@@ -13,29 +12,6 @@ namespace HV {
 InstallingPage::InstallingPage(WinWizardController& controller, const InstallerModel& model, std::string status,
                                std::int32_t percent)
     : percent_(percent), status_(std::move(status)), controller_(controller), model_(model) {}
-
-ATL::CWndClassInfo& InstallingPage::GetWndClassInfo() {
-    static ATL::CWndClassInfo info;
-    return info;
-}
-
-BOOL InstallingPage::ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM, LRESULT& result) {
-    switch (message) {
-        case WM_CREATE:
-            OnCreate();
-            return TRUE;
-        case WM_ERASEBKGND:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry handles as numbers.
-            FillClient(window, reinterpret_cast<HDC>(wParam), WizardMetrics::Instance().PageBrush);
-            result = TRUE;
-            return TRUE;
-        case WM_PAINT:
-            OnPaint();
-            return TRUE;
-        default:
-            return FALSE;
-    }
-}
 
 void InstallingPage::OnCreate() {
     title_ = model_.GetString("installer.wait.message");
@@ -56,9 +32,12 @@ void InstallingPage::SetStatusText(const std::string& text) {
     ::InvalidateRect(m_hWnd, &statusRect_, TRUE);
 }
 
-void InstallingPage::OnPaint() {
+void InstallingPage::OnErase(HDC device) const {
+    FillClient(m_hWnd, device, WizardMetrics::Instance().PageBrush);
+}
+
+void InstallingPage::OnPaint(HDC device) {
     const WizardMetrics& metrics = WizardMetrics::Instance();
-    const PaintDevice device(m_hWnd);
     DrawPageText(device, title_, titleRect_, metrics.WaitFont, DT_SINGLELINE);
     DrawPageText(device, status_, statusRect_, metrics.BodyFont, DT_SINGLELINE);
     PaintBar(device);

@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <string>
 
-#include "platform/windows/atl.h"
+#include "installer/windows/WizardWindow.h"
 
 namespace HV {
 
@@ -11,16 +11,13 @@ class InstallerModel;
 class WinWizardController;
 
 /// The page of a running install: a title, a bar and a line of status.
-class InstallingPage : public ATL::CWindowImpl<InstallingPage> {
+class InstallingPage : public WizardWindow<InstallingPage> {
 public:
     /// Neither is owned. The model has the title.
     InstallingPage(WinWizardController& controller, const InstallerModel& model, std::string status,
                    std::int32_t percent);
 
-    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~InstallingPage() override = default;
-
-    static ATL::CWndClassInfo& GetWndClassInfo();
 
     /// Each setting has the part of the page painted that shows it, and no other. A percent of -1 is an empty bar.
     void SetPercent(std::int32_t percent);
@@ -30,8 +27,11 @@ public:
     [[nodiscard]] const std::string& StatusText() const { return status_; }
 
 private:
+    friend WizardWindow;
+
     void OnCreate();
-    void OnPaint();
+    void OnErase(HDC device) const;
+    void OnPaint(HDC device);
     void PaintBar(HDC device);
 
     RECT titleRect_{};

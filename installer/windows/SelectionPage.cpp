@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "installer/windows/Painting.h"
+#include "installer/WizardArithmetic.h"
 #include "installer/windows/WizardMetrics.h"
 #include "platform/utf8.h"
 
@@ -28,11 +28,13 @@ std::wstring ControlName(const std::string& displayName) {
     return name;
 }
 
+bool IsCheckControl(int identifier) {
+    return identifier >= kFirstCheckControl && identifier <= kLastCheckControl;
+}
+
 // A check box means the same at each click, so the second one of a double click counts: no quick click is lost.
 bool IsToggle(WPARAM command) {
-    const int identifier = LOWORD(command);
-    return identifier >= kFirstCheckControl && identifier <= kLastCheckControl &&
-           (IsPress(command) || HIWORD(command) == BN_DOUBLECLICKED);
+    return IsCheckControl(LOWORD(command)) && (IsPress(command) || HIWORD(command) == BN_DOUBLECLICKED);
 }
 
 void SendCheck(HWND control, bool checked) {
@@ -59,35 +61,6 @@ void DrawCheckButton(const ProductCheckButton& button, const DRAWITEMSTRUCT& ite
 SelectionPage::SelectionPage(WinWizardController& controller)
     : brush_(Gdiplus::Color(OpaqueOf(WizardMetrics::PageColor))), controller_(controller) {}
 
-ATL::CWndClassInfo& SelectionPage::GetWndClassInfo() {
-    static ATL::CWndClassInfo info;
-    return info;
-}
-
-BOOL SelectionPage::ProcessWindowMessage(HWND, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) {
-    switch (message) {
-        case WM_CREATE:
-            OnCreate();
-            return TRUE;
-        case WM_ERASEBKGND:
-            // Nothing: the page shows the main window's colour, which has been painted before it.
-            result = TRUE;
-            return TRUE;
-        case WM_PAINT:
-            OnPaint();
-            return TRUE;
-        case WM_DRAWITEM:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry pointers as numbers.
-            result = OnDrawItem(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam)) ? TRUE : FALSE;
-            return result != FALSE;
-        case WM_COMMAND:
-            OnCommand(wParam);
-            return TRUE;
-        default:
-            return FALSE;
-    }
-}
-
 void SelectionPage::OnCreate() {
     const RECT client = GetClientRect();
     const LONG top = client.top + 30;
@@ -103,7 +76,7 @@ void SelectionPage::OnCreate() {
     for (int index = 0; index < boxes; ++index) {
         MakeCheckButton(static_cast<std::size_t>(index), CheckBoxPlace(index, client, bottom + 25));
     }
-    SendMessageToDescendants(WM_SETFONT, reinterpret_cast<WPARAM>(WizardMetrics::Instance().BodyFont), FALSE);
+    SetFontOfControls();
 }
 
 void SelectionPage::MakeCheckButton(std::size_t index, const RECT& place) {
@@ -119,34 +92,44 @@ void SelectionPage::MakeCheckButton(std::size_t index, const RECT& place) {
     checkButtons_.push_back(button);
 }
 
-void SelectionPage::OnPaint() const {
-    const PaintDevice device(m_hWnd);
+void SelectionPage::OnPaint(HDC device) const {
     RECT heading = GetClientRect();
     heading.bottom = heading.top + 25;
     DrawPageText(device, "Select which plugins you want to install.", heading, WizardMetrics::Instance().BodyFont,
                  DT_WORDBREAK);
 }
 
-bool SelectionPage::OnDrawItem(const DRAWITEMSTRUCT& item) const {
-    const auto identifier = static_cast<int>(item.CtlID);
-    if (identifier == kDeselectAllControl || identifier == kSelectAllControl) {
-        DrawButton(identifier == kDeselectAllControl ? deselectAllButton_ : selectAllButton_, item);
-        return true;
+const CustomButton* SelectionPage::ButtonForId(int identifier) const {
+    switch (identifier) {
+        case kDeselectAllControl:
+            return &deselectAllButton_;
+        case kSelectAllControl:
+            return &selectAllButton_;
+        default:
+            return nullptr;
     }
+}
+
+bool SelectionPage::OnDrawItem(const DRAWITEMSTRUCT& item) const {
     // A box that is just being made is painted once it is known here.
-    const auto index = static_cast<std::size_t>(identifier - kFirstCheckControl);
-    if (identifier < kFirstCheckControl || identifier > kLastCheckControl || index >= checkButtons_.size()) {
-        return false;
+    const std::size_t index = item.CtlID - kFirstCheckControl;
+    if (!IsCheckControl(static_cast<int>(item.CtlID)) || index >= checkButtons_.size()) {
+        return WizardWindow::OnDrawItem(item);
     }
     DrawCheckButton(checkButtons_[index], item);
     return true;
 }
 
 void SelectionPage::OnCommand(WPARAM command) {
-    const int identifier = LOWORD(command);
     if (IsToggle(command)) {
-        Toggle(identifier);
-    } else if (IsPress(command) && (identifier == kDeselectAllControl || identifier == kSelectAllControl)) {
+        Toggle(LOWORD(command));
+    } else {
+        WizardWindow::OnCommand(command);
+    }
+}
+
+void SelectionPage::OnPress(int identifier) {
+    if (ButtonForId(identifier) != nullptr) {
         CheckAll(identifier == kSelectAllControl);
     }
 }

@@ -4,9 +4,8 @@
 #include <vector>
 
 #include "installer/ProductItems.h"
-#include "installer/WizardArithmetic.h"
 #include "installer/windows/CustomButton.h"
-#include "platform/windows/atl.h"
+#include "installer/windows/WizardWindow.h"
 
 namespace HV {
 
@@ -36,15 +35,12 @@ void DrawCheckButton(const ProductCheckButton& button, const DRAWITEMSTRUCT& ite
 ///
 /// It has check boxes for the first twelve items. Further ones keep the state that they came with: they are installed
 /// if they came checked.
-class SelectionPage : public ATL::CWindowImpl<SelectionPage>, public CustomButtonOwner {
+class SelectionPage : public WizardWindow<SelectionPage>, public CustomButtonOwner {
 public:
     /// `controller` is not owned.
     explicit SelectionPage(WinWizardController& controller);
 
-    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~SelectionPage() override = default;
-
-    static ATL::CWndClassInfo& GetWndClassInfo();
 
     /// The page's own colour: corners of buttons blend into it.
     Gdiplus::Brush* BackgroundBrush() override { return &brush_; }
@@ -60,11 +56,15 @@ public:
     [[nodiscard]] const std::vector<ProductCheckButton>& CheckButtons() const { return checkButtons_; }
 
 private:
+    friend WizardWindow;
+
     void OnCreate();
     void MakeCheckButton(std::size_t index, const RECT& place);
-    void OnPaint() const;
+    void OnPaint(HDC device) const;
+    [[nodiscard]] const CustomButton* ButtonForId(int identifier) const;
     [[nodiscard]] bool OnDrawItem(const DRAWITEMSTRUCT& item) const;
     void OnCommand(WPARAM command);
+    void OnPress(int identifier);
     void CheckAll(bool checked);
     void Toggle(int identifier);
 

@@ -2,7 +2,6 @@
 
 #include "installer/InstallerModel.h"
 #include "installer/WinWizardController.h"
-#include "installer/windows/Painting.h"
 #include "installer/windows/WizardMetrics.h"
 
 namespace HV {
@@ -17,40 +16,10 @@ constexpr int kWidth = 70;  // of Agree and Disagree
 WelcomePage::WelcomePage(WinWizardController& controller, const InstallerModel& model)
     : brush_(Gdiplus::Color(OpaqueOf(WizardMetrics::PageColor))), controller_(controller), model_(model) {}
 
-ATL::CWndClassInfo& WelcomePage::GetWndClassInfo() {
-    static ATL::CWndClassInfo info;
-    return info;
-}
-
-BOOL WelcomePage::ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) {
-    switch (message) {
-        case WM_CREATE:
-            OnCreate();
-            return TRUE;
-        case WM_ERASEBKGND:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry handles as numbers.
-            FillClient(window, reinterpret_cast<HDC>(wParam), WizardMetrics::Instance().PageBrush);
-            result = TRUE;
-            return TRUE;
-        case WM_PAINT:
-            OnPaint();
-            return TRUE;
-        case WM_DRAWITEM:
-            // NOLINTNEXTLINE(performance-no-int-to-ptr): messages carry pointers as numbers.
-            result = OnDrawItem(*reinterpret_cast<const DRAWITEMSTRUCT*>(lParam)) ? TRUE : FALSE;
-            return result != FALSE;
-        case WM_COMMAND:
-            OnCommand(wParam);
-            return TRUE;
-        default:
-            return FALSE;
-    }
-}
-
 void WelcomePage::OnCreate() {
     LoadTexts();
     MakeButtons();
-    SendMessageToDescendants(WM_SETFONT, reinterpret_cast<WPARAM>(WizardMetrics::Instance().BodyFont), FALSE);
+    SetFontOfControls();
 }
 
 void WelcomePage::LoadTexts() {
@@ -79,9 +48,12 @@ void WelcomePage::MakeButtons() {
     }
 }
 
-void WelcomePage::OnPaint() const {
+void WelcomePage::OnErase(HDC device) const {
+    FillClient(m_hWnd, device, WizardMetrics::Instance().PageBrush);
+}
+
+void WelcomePage::OnPaint(HDC device) const {
     const WizardMetrics& metrics = WizardMetrics::Instance();
-    const PaintDevice device(m_hWnd);
     const RECT client = GetClientRect();
     const auto draw = [&](const std::string& text, LONG top, LONG bottom, HFONT font) {
         DrawPageText(device, text, {client.left, top, client.right, bottom}, font, DT_WORDBREAK);
@@ -106,17 +78,8 @@ const CustomButton* WelcomePage::ButtonForId(int identifier) const {
     }
 }
 
-bool WelcomePage::OnDrawItem(const DRAWITEMSTRUCT& item) const {
-    const CustomButton* const button = ButtonForId(static_cast<int>(item.CtlID));
-    if (button != nullptr) {
-        DrawButton(*button, item);
-    }
-    return button != nullptr;
-}
-
-void WelcomePage::OnCommand(WPARAM command) {
-    const int identifier = LOWORD(command);
-    if (IsPress(command) && ButtonForId(identifier) != nullptr) {
+void WelcomePage::OnPress(int identifier) {
+    if (ButtonForId(identifier) != nullptr) {
         controller_.Perform(identifier);
     }
 }

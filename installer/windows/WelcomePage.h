@@ -3,7 +3,7 @@
 #include <string>
 
 #include "installer/windows/CustomButton.h"
-#include "platform/windows/atl.h"
+#include "installer/windows/WizardWindow.h"
 
 namespace HV {
 
@@ -12,15 +12,12 @@ class WinWizardController;
 
 /// The first page: what will be installed, and the decision about the licence agreement. Its buttons go to the
 /// controller.
-class WelcomePage : public ATL::CWindowImpl<WelcomePage>, public CustomButtonOwner {
+class WelcomePage : public WizardWindow<WelcomePage>, public CustomButtonOwner {
 public:
     /// Neither is owned. The model has the texts.
     WelcomePage(WinWizardController& controller, const InstallerModel& model);
 
-    BOOL ProcessWindowMessage(HWND window, UINT message, WPARAM wParam, LPARAM lParam, LRESULT& result) override;
     ~WelcomePage() override = default;
-
-    static ATL::CWndClassInfo& GetWndClassInfo();
 
     /// The page's own colour: corners of buttons blend into it.
     Gdiplus::Brush* BackgroundBrush() override { return &brush_; }
@@ -35,13 +32,15 @@ public:
     CustomButton agreeButton;
 
 private:
+    friend WizardWindow;
+
     void OnCreate();
     void LoadTexts();
     void MakeButtons();
-    void OnPaint() const;
+    void OnErase(HDC device) const;
+    void OnPaint(HDC device) const;
     [[nodiscard]] const CustomButton* ButtonForId(int identifier) const;
-    [[nodiscard]] bool OnDrawItem(const DRAWITEMSTRUCT& item) const;
-    void OnCommand(WPARAM command);
+    void OnPress(int identifier);
 
     Gdiplus::SolidBrush brush_;
     WinWizardController& controller_;
