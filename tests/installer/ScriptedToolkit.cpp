@@ -36,6 +36,35 @@ const char* NameOf(WizardPart part) {
     return "nothing";
 }
 
+std::string NameOfCommand(int command) {
+    switch (command) {
+        case HV::kContinueCommand:
+            return "Continue";
+        case HV::kBackCommand:
+            return "Back";
+        case HV::kCancelCommand:
+            return "Cancel";
+        case HV::kReadLicenseCommand:
+            return "Read License";
+        case HV::kAgreeCommand:
+            return "Agree";
+        case HV::kDisagreeCommand:
+            return "Disagree";
+        case HV::kWhatsNewCommand:
+            return "What's New";
+        case HV::kResourcesCommand:
+            return "Resources";
+        case HV::kCloseCommand:
+            return "Close";
+        default:
+            return std::to_string(command);
+    }
+}
+
+std::string NameOfTimer(unsigned timer) {
+    return timer == HV::kProgressTimer ? "Progress" : timer == HV::kGrowTimer ? "Grow" : std::to_string(timer);
+}
+
 std::string Quoted(const std::string& text) {
     return "\"" + text + "\"";
 }
@@ -84,10 +113,10 @@ bool ScriptedToolkit::CanPress(int command) const {
 
 void ScriptedToolkit::Press(int command) {
     if (!CanPress(command)) {
-        ADD_FAILURE() << command << " cannot be pressed now";
+        ADD_FAILURE() << NameOfCommand(command) << " cannot be pressed now";
         return;
     }
-    Note("Press " + std::to_string(command));
+    Note("Press " + NameOfCommand(command));
     controller_->Perform(command);
 }
 
@@ -123,7 +152,7 @@ void ScriptedToolkit::SelectAll() {
 
 void ScriptedToolkit::Tick(unsigned timer) {
     if (!timers.contains(timer)) {
-        ADD_FAILURE() << "timer " << timer << " does not run";
+        ADD_FAILURE() << "the timer " << NameOfTimer(timer) << " does not run";
         return;
     }
     if (timer == HV::kProgressTimer) {
@@ -169,7 +198,7 @@ std::vector<std::string> ScriptedToolkit::CallsFrom(const std::string& first) co
 }
 
 void ScriptedToolkit::Note(const std::string& call) {
-    // A beep belongs to the box that comes right behind it.
+    // A beep belongs to the box that comes right after it.
     beep_.reset();
     calls.push_back(call);
 }
@@ -340,13 +369,13 @@ int ScriptedToolkit::MessageBoxA(HV::InstallerWindow* owner, const std::string& 
 }
 
 void ScriptedToolkit::SetTimer(HV::InstallerWindow& window, unsigned timer, unsigned milliseconds) {
-    Note("SetTimer " + std::to_string(timer) + " " + std::to_string(milliseconds));
+    Note("SetTimer " + NameOfTimer(timer) + " " + std::to_string(milliseconds));
     ExpectWindow(window);
     timers[timer] = milliseconds;
 }
 
 void ScriptedToolkit::KillTimer(HV::InstallerWindow& window, unsigned timer) {
-    Note("KillTimer " + std::to_string(timer));
+    Note("KillTimer " + NameOfTimer(timer));
     ExpectWindow(window);
     timers.erase(timer);
 }

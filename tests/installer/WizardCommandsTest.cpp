@@ -17,12 +17,28 @@ protected:
     }
 };
 
+// The identifiers of the controls, as whoever drives the window from outside knows them.
+TEST(WizardCommandNumbers, AreThoseOfTheControls) {
+    EXPECT_EQ(HV::kContinueCommand, 1124);
+    EXPECT_EQ(HV::kBackCommand, 1125);
+    EXPECT_EQ(HV::kCancelCommand, 1126);
+    EXPECT_EQ(HV::kReadLicenseCommand, 1127);
+    EXPECT_EQ(HV::kAgreeCommand, 1128);
+    EXPECT_EQ(HV::kDisagreeCommand, 1129);
+    EXPECT_EQ(HV::kWhatsNewCommand, 1133);
+    EXPECT_EQ(HV::kResourcesCommand, 1134);
+    EXPECT_EQ(HV::kCloseCommand, 1165);
+    EXPECT_EQ(HV::kProgressTimer, 62017U);
+    EXPECT_EQ(HV::kGrowTimer, 62018U);
+}
+
 TEST_F(WizardCommands, AllButContinueAndBackMayAlwaysRun) {
     Begin();
     int asked = 0;
     for (const WizardState state : kStates) {
         wizard.state = state;
-        for (const int command : {1126, 1165, 1127, 1128, 1129, 1133, 1134}) {
+        for (const int command : {HV::kCancelCommand, HV::kCloseCommand, HV::kReadLicenseCommand, HV::kAgreeCommand,
+                                  HV::kDisagreeCommand, HV::kWhatsNewCommand, HV::kResourcesCommand}) {
             EXPECT_TRUE(wizard.CanPerform(command)) << command << " in " << static_cast<int>(state);
             ++asked;
         }
@@ -36,7 +52,7 @@ TEST_F(WizardCommands, BackMayRunOnTheSelectionPageAlone) {
     int asked = 0;
     for (const WizardState state : kStates) {
         wizard.state = state;
-        EXPECT_EQ(wizard.CanPerform(1125), state == WizardState::Selection) << static_cast<int>(state);
+        EXPECT_EQ(wizard.CanPerform(HV::kBackCommand), state == WizardState::Selection) << static_cast<int>(state);
         ++asked;
     }
     EXPECT_EQ(asked, 5);
@@ -48,7 +64,7 @@ TEST_F(WizardCommands, BackDoesNothingElsewhere) {
     int tried = 0;
     for (const WizardState state : {WizardState::Welcome, WizardState::Installing, WizardState::Finished}) {
         wizard.state = state;
-        wizard.Perform(1125);
+        wizard.Perform(HV::kBackCommand);
         EXPECT_EQ(wizard.state, state);
         ++tried;
     }
@@ -59,16 +75,16 @@ TEST_F(WizardCommands, BackDoesNothingElsewhere) {
 TEST_F(WizardCommands, ContinueMayNotRunDuringTheInstall) {
     GoToSelection();
     wizard.state = WizardState::Installing;
-    EXPECT_FALSE(wizard.CanPerform(1124));
+    EXPECT_FALSE(wizard.CanPerform(HV::kContinueCommand));
     wizard.state = WizardState::Selection;
-    EXPECT_TRUE(wizard.CanPerform(1124));
+    EXPECT_TRUE(wizard.CanPerform(HV::kContinueCommand));
 }
 
 TEST_F(WizardCommands, ContinueMayRunInEveryOtherState) {
     Begin();
     for (const WizardState state : {WizardState::Welcome, WizardState::Finished, WizardState::Failed}) {
         wizard.state = state;
-        EXPECT_TRUE(wizard.CanPerform(1124)) << static_cast<int>(state);
+        EXPECT_TRUE(wizard.CanPerform(HV::kContinueCommand)) << static_cast<int>(state);
     }
 }
 
@@ -76,8 +92,8 @@ TEST_F(WizardCommands, ContinueNeedsTheAgreementOnTheSelectionPage) {
     GoToSelection();
     toolkit.DeselectAll();
     wizard.agreed = false;
-    EXPECT_FALSE(wizard.CanPerform(1124));
-    wizard.Perform(1124);
+    EXPECT_FALSE(wizard.CanPerform(HV::kContinueCommand));
+    wizard.Perform(HV::kContinueCommand);
     EXPECT_EQ(wizard.state, WizardState::Selection);
     EXPECT_TRUE(toolkit.boxes.empty()) << "the missing agreement comes before the missing choice";
 }
@@ -85,7 +101,7 @@ TEST_F(WizardCommands, ContinueNeedsTheAgreementOnTheSelectionPage) {
 TEST_F(WizardCommands, ContinueDoesNothingOnTheFirstPageWithoutTheAgreement) {
     Begin();
     const auto before = toolkit.calls;
-    wizard.Perform(1124);
+    wizard.Perform(HV::kContinueCommand);
     EXPECT_EQ(toolkit.calls, before);
     EXPECT_EQ(wizard.state, WizardState::Welcome);
     EXPECT_EQ(wizard.selectionPage, nullptr);
@@ -95,14 +111,14 @@ TEST_F(WizardCommands, ContinueDoesNothingAfterAFailure) {
     GoToSelection();
     wizard.state = WizardState::Failed;
     const auto before = toolkit.calls;
-    wizard.Perform(1124);
+    wizard.Perform(HV::kContinueCommand);
     EXPECT_EQ(toolkit.calls, before);
 }
 
 TEST_F(WizardCommands, ContinueEndsTheFinishedWizard) {
     Begin();
     wizard.state = WizardState::Finished;
-    wizard.Perform(1124);
+    wizard.Perform(HV::kContinueCommand);
     EXPECT_EQ(toolkit.quits, std::vector{0});
 }
 
@@ -122,11 +138,11 @@ TEST_F(WizardCommands, OthersDoNothing) {
 TEST_F(WizardCommands, AgreeOpensTheWayAndCannotBeTakenBack) {
     Begin();
     toolkit.Press(HV::kAgreeCommand);
-    EXPECT_EQ(toolkit.CallsFrom("Press 1128"),
-              (std::vector<std::string>{"Press 1128", "EnableWindow ContinueButton true", "SetContinueHighlighted true",
-                                        "SetContinueText \"Continue\"", "EnableWindow AgreeButton false",
-                                        "RedrawWindow AgreeButton", "EnableWindow DisagreeButton false",
-                                        "RedrawWindow DisagreeButton"}));
+    EXPECT_EQ(toolkit.CallsFrom("Press Agree"),
+              (std::vector<std::string>{"Press Agree", "EnableWindow ContinueButton true",
+                                        "SetContinueHighlighted true", "SetContinueText \"Continue\"",
+                                        "EnableWindow AgreeButton false", "RedrawWindow AgreeButton",
+                                        "EnableWindow DisagreeButton false", "RedrawWindow DisagreeButton"}));
     EXPECT_TRUE(wizard.agreed);
     EXPECT_EQ(wizard.state, WizardState::Welcome);
     EXPECT_TRUE(toolkit.CanPress(HV::kContinueCommand));
@@ -147,7 +163,7 @@ TEST_F(WizardCommands, CancelAndCloseEndTheWizardInEveryState) {
     Begin();
     int tried = 0;
     for (const WizardState state : kStates) {
-        for (const int command : {1126, 1165}) {
+        for (const int command : {HV::kCancelCommand, HV::kCloseCommand}) {
             wizard.state = state;
             wizard.Perform(command);
             ++tried;
@@ -163,7 +179,7 @@ TEST_F(WizardCommands, CancelLeavesAnEngineAloneThatDoesNotExistYet) {
     HV::DeployJob notStarted("");
     wizard.job = &notStarted;
     wizard.state = WizardState::Installing;
-    wizard.Perform(1126);
+    wizard.Perform(HV::kCancelCommand);
     EXPECT_EQ(toolkit.quits, std::vector{0});
     EXPECT_FALSE(log.Has("CRIT hvdeploy-detail: Cancel invoked"));
     wizard.job = nullptr;
@@ -178,13 +194,13 @@ TEST_F(WizardCommands, CancelLeavesTheEngineAloneOutsideOfTheInstall) {
     for (const WizardState state :
          {WizardState::Welcome, WizardState::Selection, WizardState::Finished, WizardState::Failed}) {
         wizard.state = state;
-        wizard.Perform(1126);
+        wizard.Perform(HV::kCancelCommand);
         ++tried;
     }
     EXPECT_EQ(tried, 4);
     EXPECT_FALSE(log.Has("CRIT hvdeploy-detail: Cancel invoked"));
     wizard.state = WizardState::Installing;
-    wizard.Perform(1126);
+    wizard.Perform(HV::kCancelCommand);
     EXPECT_TRUE(log.Has("CRIT hvdeploy-detail: Cancel invoked"));
     wizard.job = nullptr;
 }
@@ -209,8 +225,8 @@ protected:
     std::vector<std::string> UrlsOf(const std::string& productUrl) {
         ShipsSuiteWithUrl(productUrl);
         Begin();
-        wizard.Perform(1133);
-        wizard.Perform(1134);
+        wizard.Perform(HV::kWhatsNewCommand);
+        wizard.Perform(HV::kResourcesCommand);
         return toolkit.urls;
     }
     using Urls = std::vector<std::string>;
@@ -241,8 +257,8 @@ TEST_F(WizardLinks, LeadNowhereWithAnEmptyPage) {
 TEST_F(WizardLinks, LeadNowhereWithoutAPage) {
     setup.HasSuite(R"({"identifier": "com.halvorn.tessaly-suite", "product_type": "0"})");
     Begin();
-    wizard.Perform(1133);
-    wizard.Perform(1134);
+    wizard.Perform(HV::kWhatsNewCommand);
+    wizard.Perform(HV::kResourcesCommand);
     EXPECT_TRUE(toolkit.urls.empty());
 }
 

@@ -14,21 +14,21 @@ class WizardInstall : public WizardTest {
 protected:
     static constexpr const char* kLogPrefix = R"(C:\ProgramData\Halvorn\logs\com.halvorn.tessaly-suite-)";
 
-    /// The time that the line carries; -1 when the line is not `before`, a time and `behind`.
+    /// The time that the line carries; -1 when the line is not `before`, a time and `after`.
     [[nodiscard]] static std::int64_t TimeIn(const std::string& line, const std::string& before,
-                                             const std::string& behind) {
-        if (!line.starts_with(before) || !line.ends_with(behind) || line.size() <= before.size() + behind.size()) {
+                                             const std::string& after) {
+        if (!line.starts_with(before) || !line.ends_with(after) || line.size() <= before.size() + after.size()) {
             return -1;
         }
-        const std::string time = line.substr(before.size(), line.size() - before.size() - behind.size());
+        const std::string time = line.substr(before.size(), line.size() - before.size() - after.size());
         return std::ranges::all_of(time, [](char c) { return c >= '0' && c <= '9'; }) ? std::stoll(time) : -1;
     }
 
     /// Expects the line of an install that skips as told.
     void ExpectLine(const std::string& skip, std::time_t earliest) const {
         const std::string before = "--verbose " + skip + "log=\"" + kLogPrefix;
-        const std::string behind = std::string("-log.txt\" --legacyuninstall dir=\"") + kPackages + "\"";
-        const std::int64_t time = TimeIn(Line(), before, behind);
+        const std::string after = std::string("-log.txt\" --legacyuninstall dir=\"") + kPackages + "\"";
+        const std::int64_t time = TimeIn(Line(), before, after);
         EXPECT_GE(time, earliest) << Line();
         EXPECT_LE(time, std::time(nullptr)) << Line();
     }
@@ -42,11 +42,11 @@ TEST_F(WizardInstall, EndsWithTheFinalPage) {
     EXPECT_EQ(percents.back(), 100);
     EXPECT_TRUE(std::ranges::is_sorted(percents));
     EXPECT_EQ(toolkit.Installing().status, "Installation complete.");
-    EXPECT_EQ(toolkit.CallsFrom("KillTimer 62017"),
-              (std::vector<std::string>{"KillTimer 62017", "CreateFinalPage", "ShowWindow InstallingPage 0",
-                                        "ShowFinalButtons", "ShowWindow FinalPage 5", "SetTimer 62018 50"}));
+    EXPECT_EQ(toolkit.CallsFrom("KillTimer Progress"),
+              (std::vector<std::string>{"KillTimer Progress", "CreateFinalPage", "ShowWindow InstallingPage 0",
+                                        "ShowFinalButtons", "ShowWindow FinalPage 5", "SetTimer Grow 50"}));
     EXPECT_EQ(toolkit.VisiblePages(), std::vector{WizardPart::FinalPage});
-    EXPECT_EQ(toolkit.timers, (std::map<unsigned, unsigned>{{62018, 50}}));
+    EXPECT_EQ(toolkit.timers, (std::map<unsigned, unsigned>{{HV::kGrowTimer, 50}}));
     EXPECT_TRUE(toolkit.boxes.empty());
     EXPECT_TRUE(toolkit.quits.empty());
     WaitForJob();
@@ -77,7 +77,7 @@ TEST_F(WizardInstall, ShowsItsPageBeforeTheEngineStarts) {
               (std::vector<std::string>{"CreateInstallingPage \"Detecting host applications...\" 0",
                                         "ShowWindow SelectionPage 0", "ShowWindow InstallingPage 5",
                                         "EnableWindow BackButton false", "EnableWindow ContinueButton false",
-                                        "SetTimer 62017 333"}));
+                                        "SetTimer Progress 333"}));
     EXPECT_EQ(wizard.state, WizardState::Installing);
     EXPECT_EQ(wizard.installingPage, &toolkit.Installing());
     EXPECT_EQ(toolkit.VisiblePages(), std::vector{WizardPart::InstallingPage});
@@ -91,7 +91,7 @@ TEST_F(WizardInstall, ShowsItsPageBeforeTheEngineStarts) {
     toolkit.Tick(HV::kProgressTimer);
     EXPECT_EQ(toolkit.Installing().status, "Preparing to install...");
     EXPECT_EQ(toolkit.Installing().percent, 1);
-    EXPECT_EQ(toolkit.timers, (std::map<unsigned, unsigned>{{62017, 333}}));
+    EXPECT_EQ(toolkit.timers, (std::map<unsigned, unsigned>{{HV::kProgressTimer, 333}}));
 }
 
 TEST_F(WizardInstall, SkipsNothingWhenEverythingIsChosen) {
@@ -191,10 +191,10 @@ TEST_F(FailingInstall, TellsAndEnds) {
     EXPECT_EQ(wizard.state, WizardState::Failed);
     EXPECT_EQ(toolkit.Installing().percent, -1);
     EXPECT_EQ(toolkit.Installing().status, kFailureText);
-    EXPECT_TRUE(toolkit.timers.empty()) << "nothing polls behind the box";
+    EXPECT_TRUE(toolkit.timers.empty()) << "nothing polls while the box is open";
     EXPECT_EQ(toolkit.CallsFrom("SetPercent -1"),
               (std::vector<std::string>{"SetPercent -1", std::string("SetStatusText \"") + kFailureText + "\"",
-                                        "KillTimer 62017", "MessageBeep 16", "MessageBoxA \"Installation Failed\"",
+                                        "KillTimer Progress", "MessageBeep 16", "MessageBoxA \"Installation Failed\"",
                                         "ExitProcess 0"}));
     EXPECT_EQ(wizard.finalPage, nullptr);
     EXPECT_EQ(machine.Content(PlaceOf("glow")), "the old one");
@@ -213,7 +213,7 @@ TEST_F(FailingInstall, PassesForASuccessAtThePollThatLandsOnAHundred) {
     heldLog.gate.LetGo();
     WaitForJob();
     EXPECT_EQ(wizard.job->error, -1);
-    EXPECT_FALSE(toolkit.timers.contains(62017)) << "nobody polls any more";
+    EXPECT_FALSE(toolkit.timers.contains(HV::kProgressTimer)) << "nobody polls any more";
     EXPECT_TRUE(toolkit.boxes.empty());
 }
 
@@ -287,7 +287,7 @@ TEST_F(CancelledInstall, ShowsWhatTheEngineSaidLast) {
     toolkit.Tick(HV::kProgressTimer);
     EXPECT_EQ(toolkit.Installing().status, "Installing com.halvorn.glow.hvpkg...");
     EXPECT_EQ(wizard.state, WizardState::Installing);
-    EXPECT_TRUE(toolkit.timers.contains(62017));
+    EXPECT_TRUE(toolkit.timers.contains(HV::kProgressTimer));
 }
 
 /// Polls of a job that says what the test wants. It has no engine and no thread.
@@ -326,7 +326,7 @@ TEST_F(Poll, TakesOverWhatDiffers) {
     EXPECT_EQ(TickAt(9, "later"), (Calls{"SetPercent 9", "SetStatusText \"later\""}));
     EXPECT_EQ(TickAt(9, "later"), Calls{});
     EXPECT_EQ(wizard.state, WizardState::Installing);
-    EXPECT_TRUE(toolkit.timers.contains(62017));
+    EXPECT_TRUE(toolkit.timers.contains(HV::kProgressTimer));
 }
 
 TEST_F(Poll, NeverBlanksTheStatus) {
@@ -356,8 +356,8 @@ TEST_F(Poll, GoesOnAtTheMarkOfAFailureWithoutAnError) {
 
 TEST_F(Poll, FinishesWithoutAText) {
     EXPECT_EQ(TickAt(100, ""),
-              (Calls{"SetPercent 100", "KillTimer 62017", "CreateFinalPage", "ShowWindow InstallingPage 0",
-                     "ShowFinalButtons", "ShowWindow FinalPage 5", "SetTimer 62018 50"}));
+              (Calls{"SetPercent 100", "KillTimer Progress", "CreateFinalPage", "ShowWindow InstallingPage 0",
+                     "ShowFinalButtons", "ShowWindow FinalPage 5", "SetTimer Grow 50"}));
     EXPECT_EQ(toolkit.Installing().status, "before");
     EXPECT_TRUE(toolkit.Window().hasFinalButtons);
 }
@@ -378,7 +378,7 @@ TEST_F(Poll, FailsAtAHundredWithAnError) {
 TEST_F(Poll, KeepsTheStatusAtAFailureWithoutAText) {
     EndAt(HV::kFailedPercent, "", -2);
     EXPECT_EQ(toolkit.Installing().status, "before");
-    EXPECT_EQ(toolkit.calls, (Calls{"SetPercent -1", "KillTimer 62017", "MessageBeep 16",
+    EXPECT_EQ(toolkit.calls, (Calls{"SetPercent -1", "KillTimer Progress", "MessageBeep 16",
                                     "MessageBoxA \"Installation Failed\"", "ExitProcess 0"}));
 }
 
@@ -387,8 +387,8 @@ TEST_F(Poll, StopsItsTimerOutsideOfTheInstall) {
     for (const WizardState state :
          {WizardState::Welcome, WizardState::Selection, WizardState::Finished, WizardState::Failed}) {
         wizard.state = state;
-        toolkit.timers[62017] = 333;
-        EXPECT_EQ(TickAt(100, "done"), Calls{"KillTimer 62017"});
+        toolkit.timers[HV::kProgressTimer] = 333;
+        EXPECT_EQ(TickAt(100, "done"), Calls{"KillTimer Progress"});
         EXPECT_EQ(wizard.state, state);
         ++tried;
     }
@@ -398,7 +398,7 @@ TEST_F(Poll, StopsItsTimerOutsideOfTheInstall) {
 TEST_F(Poll, StopsItsTimerWithoutAJob) {
     wizard.job = nullptr;
     toolkit.Tick(HV::kProgressTimer);
-    EXPECT_EQ(toolkit.calls, Calls{"KillTimer 62017"});
+    EXPECT_EQ(toolkit.calls, Calls{"KillTimer Progress"});
     EXPECT_EQ(wizard.state, WizardState::Installing);
 }
 

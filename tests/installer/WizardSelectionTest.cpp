@@ -67,7 +67,7 @@ TEST_F(WizardSelection, GoesBackToTheFirstPageWhichGoesOnReadingInstall) {
     Ships(Product("glow"));
     GoToSelection();
     toolkit.Press(HV::kBackCommand);
-    EXPECT_EQ(toolkit.CallsFrom("Press 1125"), (Texts{"Press 1125", "ShowWindow SelectionPage 0",
+    EXPECT_EQ(toolkit.CallsFrom("Press Back"), (Texts{"Press Back", "ShowWindow SelectionPage 0",
                                                       "ShowWindow WelcomePage 5", "EnableWindow BackButton false"}));
     EXPECT_EQ(wizard.state, WizardState::Welcome);
     EXPECT_EQ(toolkit.VisiblePages(), std::vector{WizardPart::WelcomePage});
@@ -135,7 +135,7 @@ TEST_F(WizardSelection, IsSatisfiedWithOneProduct) {
     GoToSelection();
     toolkit.DeselectAll();
     toolkit.Toggle("com.halvorn.keyer");
-    EXPECT_TRUE(wizard.CanPerform(1124));
+    EXPECT_TRUE(wizard.CanPerform(HV::kContinueCommand));
     EXPECT_TRUE(toolkit.boxes.empty());
 }
 
@@ -151,7 +151,7 @@ TEST_F(WizardSelection, OnlyFlashesByWhenThereIsNothingToChoose) {
                      "ShowWindow SelectionPage 5", "EnableWindow BackButton true",
                      "CreateInstallingPage \"Detecting host applications...\" 0", "ShowWindow SelectionPage 0",
                      "ShowWindow InstallingPage 5", "EnableWindow BackButton false",
-                     "EnableWindow ContinueButton false", "SetTimer 62017 333"}));
+                     "EnableWindow ContinueButton false", "SetTimer Progress 333"}));
     WaitForJob();
     EXPECT_EQ(machine.Content(PlaceOf("core")), TextOf("core"));
 }

@@ -6,6 +6,9 @@
 
 namespace {
 
+// The box for the name in the system's dialogue.
+constexpr int kNameBox = 1148;
+
 class AgreementTest : public WizardTest {
 protected:
     /// One viewer more, opened by the wizard's button.
@@ -55,7 +58,7 @@ TEST_F(AgreementTest, ShowsTheAgreementInAWindowOfItsOwn) {
                             {0, {30, 50, 510, 545}, 0x50A10844, true, true}});
     // Windows keeps a class under the name that it was registered by, whose capitals are its own.
     EXPECT_STRCASEEQ(ClassOf(GetDlgItem(viewer, 0)).c_str(), "RICHEDIT50W");
-    // The buttons have nobody who says what lies behind them: their corners are black.
+    // The buttons have no owner that says what they are drawn on: their corners are black.
     EXPECT_TRUE(wizard.Shows(
         viewer, {look::Filled({0, 0, 550, 50}, look::Light), look::Filled({0, 0, 30, 600}, look::Light),
                  look::Filled({510, 0, 550, 565}, look::Light), look::Filled({0, 545, 550, 565}, look::Light),
@@ -116,7 +119,7 @@ TEST_F(AgreementTest, SavesTheBytesOfTheDocument) {
     const Box dialogue = wizard.WaitForBox("Save As");
     EXPECT_EQ(dialogue.owner, viewer);
     HWND name = nullptr;
-    EXPECT_TRUE(Eventually([&] { return (name = GetDlgItem(dialogue.handle, 1148)) != nullptr; }));
+    EXPECT_TRUE(Eventually([&] { return (name = GetDlgItem(dialogue.handle, kNameBox)) != nullptr; }));
     EXPECT_TRUE(Eventually([&] { return TextOf(name) == "Halvorn Software License"; })) << TextOf(name);
     machine().HasFolder(R"(C:\Kept)");
     SendMessageA(name, WM_SETTEXT, 0, reinterpret_cast<LPARAM>(R"(C:\Kept\Agreement)"));
@@ -138,7 +141,7 @@ TEST_F(AgreementTest, AsksBeforeItReplacesAFile) {
     wizard.PressForBox(viewer, id::SaveLicense);
     const Box dialogue = wizard.WaitForBox("Save As");
     HWND name = nullptr;
-    EXPECT_TRUE(Eventually([&] { return (name = GetDlgItem(dialogue.handle, 1148)) != nullptr; }));
+    EXPECT_TRUE(Eventually([&] { return (name = GetDlgItem(dialogue.handle, kNameBox)) != nullptr; }));
     EXPECT_TRUE(Eventually([&] { return TextOf(name) == "Halvorn Software License"; })) << TextOf(name);
     SendMessageA(name, WM_SETTEXT, 0, reinterpret_cast<LPARAM>(R"(C:\Kept\Agreement)"));
     PostMessageA(GetDlgItem(dialogue.handle, IDOK), BM_CLICK, 0, 0);

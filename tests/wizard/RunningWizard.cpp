@@ -185,7 +185,7 @@ std::vector<HWND> RunningWizard::TopWindows() const {
 bool RunningWizard::HasWindow() {
     if (window_ == nullptr) {
         for (const HWND window : TopWindows()) {
-            if (GetDlgItem(window, 1124) != nullptr) {
+            if (GetDlgItem(window, id::Continue) != nullptr) {
                 window_ = window;
             }
         }
@@ -230,7 +230,7 @@ HWND RunningWizard::PageWithoutControls() {
 
 std::vector<HWND> RunningWizard::Viewers() const {
     std::vector<HWND> viewers = TopWindows();
-    std::erase_if(viewers, [](HWND window) { return GetDlgItem(window, 1184) == nullptr; });
+    std::erase_if(viewers, [](HWND window) { return GetDlgItem(window, id::SaveLicense) == nullptr; });
     return viewers;
 }
 

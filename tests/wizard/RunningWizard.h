@@ -10,6 +10,26 @@
 
 #include "tests/wizard/Look.h"
 
+/// The identifiers of the wizard's controls and timers. They stand here a second time on purpose: taken from the
+/// program they would prove nothing.
+namespace id {
+constexpr int Continue = 1124;
+constexpr int Back = 1125;
+constexpr int Cancel = 1126;
+constexpr int ReadLicense = 1127;
+constexpr int Agree = 1128;
+constexpr int Disagree = 1129;
+constexpr int DeselectAll = 1130;
+constexpr int SelectAll = 1131;
+constexpr int WhatsNew = 1133;
+constexpr int Resources = 1134;
+constexpr int FirstProduct = 1144;
+constexpr int Close = 1165;
+constexpr int CloseViewer = 161;
+constexpr int SaveLicense = 1184;
+constexpr unsigned GrowTimer = 62018;
+}  // namespace id
+
 /// Asks again every 20 ms until the answer is yes; whether it came within a minute, the time that a busy machine may
 /// take for anything.
 bool Eventually(const std::function<bool()>& question);

@@ -127,7 +127,7 @@ TEST_F(WelcomeTest, GrowsByFiftyAStepAndStopsAtItsWidth) {
     const RECT start = OnScreen(window);
     int steps = 0;
     for (const int width : {650, 700, 750, 800, 800}) {
-        SendMessageA(window, WM_TIMER, 62018, 0);
+        SendMessageA(window, WM_TIMER, id::GrowTimer, 0);
         const RECT now = OnScreen(window);
         const LONG onEachSide = (width - 600) / 2;
         EXPECT_EQ(now, (RECT{start.left - onEachSide, start.top, start.right + onEachSide, start.bottom})) << width;

@@ -11,24 +11,6 @@
 #include "tests/wizard/CommandGate.h"
 #include "tests/wizard/RunningWizard.h"
 
-/// The identifiers of the wizard's controls.
-namespace id {
-constexpr int Continue = 1124;
-constexpr int Back = 1125;
-constexpr int Cancel = 1126;
-constexpr int ReadLicense = 1127;
-constexpr int Agree = 1128;
-constexpr int Disagree = 1129;
-constexpr int DeselectAll = 1130;
-constexpr int SelectAll = 1131;
-constexpr int WhatsNew = 1133;
-constexpr int Resources = 1134;
-constexpr int FirstProduct = 1144;
-constexpr int Close = 1165;
-constexpr int CloseViewer = 161;
-constexpr int SaveLicense = 1184;
-}  // namespace id
-
 /// A machine with the sample release in C:\Release and, where a test asks for them, hosts; and what the walks through
 /// the wizard there have in common.
 ///

@@ -14,10 +14,8 @@
 
 namespace {
 
-constexpr int kClose = 161;
-
 BOOL CALLBACK KeepViewer(HWND window, LPARAM found) {
-    if (::GetDlgItem(window, kClose) != nullptr) {
+    if (::GetDlgItem(window, HV::kCloseViewerControl) != nullptr) {
         reinterpret_cast<std::vector<HWND>*>(found)->push_back(window);
     }
     return TRUE;
@@ -49,11 +47,14 @@ protected:
 };
 
 TEST_F(AgreementViewerTest, HasItsControls) {
+    EXPECT_EQ(HV::kCloseViewerControl, 161);
+    EXPECT_EQ(HV::kSaveLicenseControl, 1184);
     viewers.ShowAgreement();
     std::vector<Control> controls = ControlsOf(Viewer());
     ASSERT_EQ(controls.size(), 3U);
-    EXPECT_EQ(controls[0], (Control{161, L"Button", L"Close", {350, 565, 430, 590}, 0x5001000B}));
-    EXPECT_EQ(controls[1], (Control{1184, L"Button", L"Save License", {440, 565, 520, 590}, 0x5001000B}));
+    EXPECT_EQ(controls[0], (Control{HV::kCloseViewerControl, L"Button", L"Close", {350, 565, 430, 590}, 0x5001000B}));
+    EXPECT_EQ(controls[1],
+              (Control{HV::kSaveLicenseControl, L"Button", L"Save License", {440, 565, 520, 590}, 0x5001000B}));
     EXPECT_EQ(controls[2].identifier, 0);
     EXPECT_EQ(controls[2].place, (RECT{30, 50, 510, 545}));
     EXPECT_EQ(controls[2].style, 0x50A10844U);
@@ -177,12 +178,12 @@ TEST_F(AgreementViewerTest, HasALightBackground) {
 TEST_F(AgreementViewerTest, HasBlackCornersAroundItsButtonsAndABlueSaveButton) {
     viewers.ShowAgreement();
     Canvas canvas(80, 25);
-    DRAWITEMSTRUCT save = DrawRequest(canvas, ::GetDlgItem(Viewer(), 1184), {0, 0, 80, 25});
-    ::SendMessageW(Viewer(), WM_DRAWITEM, 1184, reinterpret_cast<LPARAM>(&save));
+    DRAWITEMSTRUCT save = DrawRequest(canvas, ::GetDlgItem(Viewer(), HV::kSaveLicenseControl), {0, 0, 80, 25});
+    ::SendMessageW(Viewer(), WM_DRAWITEM, HV::kSaveLicenseControl, reinterpret_cast<LPARAM>(&save));
     EXPECT_EQ(canvas.At(0, 0), 0U);
     EXPECT_EQ(canvas.At(40, 2), 0x009FE1U);
-    DRAWITEMSTRUCT close = DrawRequest(canvas, ::GetDlgItem(Viewer(), kClose), {0, 0, 80, 25});
-    ::SendMessageW(Viewer(), WM_DRAWITEM, kClose, reinterpret_cast<LPARAM>(&close));
+    DRAWITEMSTRUCT close = DrawRequest(canvas, ::GetDlgItem(Viewer(), HV::kCloseViewerControl), {0, 0, 80, 25});
+    ::SendMessageW(Viewer(), WM_DRAWITEM, HV::kCloseViewerControl, reinterpret_cast<LPARAM>(&close));
     EXPECT_EQ(canvas.At(0, 0), 0U);
     EXPECT_EQ(canvas.At(40, 2), 0x434343U);
 }
@@ -197,7 +198,7 @@ TEST_F(AgreementViewerTest, ClosesAloneAndLeavesTheRestOpen) {
     viewers.ShowAgreement();
     const HWND first = Viewer();
     viewers.ShowAgreement();
-    Press(first, kClose);
+    Press(first, HV::kCloseViewerControl);
     EXPECT_EQ(::IsWindow(first), FALSE);
     EXPECT_EQ(Viewers().size(), 1U);
     EXPECT_FALSE(LoopHasEnded());
@@ -216,8 +217,8 @@ TEST_F(AgreementViewerTest, ClosesByItsBoxAndByEscape) {
 TEST_F(AgreementViewerTest, StaysOpenForWhateverIsNoPress) {
     viewers.ShowAgreement();
     Press(Viewer(), 0, EN_CHANGE);
-    Press(Viewer(), kClose, EN_SETFOCUS);
-    Press(Viewer(), kClose, BN_DOUBLECLICKED);
+    Press(Viewer(), HV::kCloseViewerControl, EN_SETFOCUS);
+    Press(Viewer(), HV::kCloseViewerControl, BN_DOUBLECLICKED);
     EXPECT_EQ(Viewers().size(), 1U);
 }
 

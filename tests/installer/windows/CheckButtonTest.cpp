@@ -22,7 +22,7 @@ protected:
     CheckButtonTest() {
         button.displayName = "Tessaly Glow";
         button.background = WizardMetrics::Instance().PageBrush;
-        button.handle = HV::MakeButtonControl(Parent(), L"Tessaly Glow", 1144, kPlace, 0x5001010B);
+        button.handle = HV::MakeButtonControl(Parent(), L"Tessaly Glow", HV::kFirstCheckControl, kPlace, 0x5001010B);
     }
 
     void Draw(UINT state = 0) { HV::DrawCheckButton(button, DrawRequest(canvas, button.handle, kPlace, state)); }

@@ -60,22 +60,23 @@ TEST_F(InstallerWindowTest, HasASmallIconAndABigOne) {
 
 TEST_F(InstallerWindowTest, HasThreeButtonsAlongTheBottom) {
     EXPECT_EQ(ControlsOf(Make()), (std::vector<Control>{
-                                      {1124, L"Button", L"Continue", {495, 358, 575, 383}, 0x5801000B},
-                                      {1125, L"Button", L"Back", {405, 358, 485, 383}, 0x5801000B},
-                                      {1126, L"Button", L"Cancel", {195, 358, 275, 383}, 0x5001000B},
+                                      {HV::kContinueCommand, L"Button", L"Continue", {495, 358, 575, 383}, 0x5801000B},
+                                      {HV::kBackCommand, L"Button", L"Back", {405, 358, 485, 383}, 0x5801000B},
+                                      {HV::kCancelCommand, L"Button", L"Cancel", {195, 358, 275, 383}, 0x5001000B},
                                   }));
 }
 
 TEST_F(InstallerWindowTest, PutsTheFinalButtonsInTheirPlace) {
     Make().ShowFinalButtons();
-    EXPECT_EQ(ControlsOf(*window), (std::vector<Control>{
-                                       {1124, L"Button", L"Continue", {495, 358, 575, 383}, 0x4801000B},
-                                       {1125, L"Button", L"Back", {405, 358, 485, 383}, 0x4801000B},
-                                       {1126, L"Button", L"Cancel", {195, 358, 275, 383}, 0x4001000B},
-                                       {1133, L"Button", L"What's New...", {145, 358, 275, 383}, 0x5001000B},
-                                       {1134, L"Button", L"Resources...", {280, 358, 410, 383}, 0x5001000B},
-                                       {1165, L"Button", L"Close", {645, 358, 775, 383}, 0x5001000B},
-                                   }));
+    EXPECT_EQ(ControlsOf(*window),
+              (std::vector<Control>{
+                  {HV::kContinueCommand, L"Button", L"Continue", {495, 358, 575, 383}, 0x4801000B},
+                  {HV::kBackCommand, L"Button", L"Back", {405, 358, 485, 383}, 0x4801000B},
+                  {HV::kCancelCommand, L"Button", L"Cancel", {195, 358, 275, 383}, 0x4001000B},
+                  {HV::kWhatsNewCommand, L"Button", L"What's New...", {145, 358, 275, 383}, 0x5001000B},
+                  {HV::kResourcesCommand, L"Button", L"Resources...", {280, 358, 410, 383}, 0x5001000B},
+                  {HV::kCloseCommand, L"Button", L"Close", {645, 358, 775, 383}, 0x5001000B},
+              }));
 }
 
 TEST_F(InstallerWindowTest, GivesEveryButtonTheBodyFont) {
@@ -90,17 +91,17 @@ TEST_F(InstallerWindowTest, GivesEveryButtonTheBodyFont) {
 
 TEST_F(InstallerWindowTest, KnowsItsButtonsByTheirIdentifiers) {
     HV::InstallerWindow& made = Make();
-    EXPECT_EQ(made.ButtonForId(1124), &made.continueButton);
-    EXPECT_EQ(made.ButtonForId(1125), &made.backButton);
-    EXPECT_EQ(made.ButtonForId(1126), &made.cancelButton);
-    EXPECT_EQ(made.ButtonForId(1133), &made.whatsNewButton);
-    EXPECT_EQ(made.ButtonForId(1134), &made.resourcesButton);
-    EXPECT_EQ(made.ButtonForId(1165), &made.closeButton);
-    EXPECT_EQ(made.ButtonForId(1127), nullptr);
+    EXPECT_EQ(made.ButtonForId(HV::kContinueCommand), &made.continueButton);
+    EXPECT_EQ(made.ButtonForId(HV::kBackCommand), &made.backButton);
+    EXPECT_EQ(made.ButtonForId(HV::kCancelCommand), &made.cancelButton);
+    EXPECT_EQ(made.ButtonForId(HV::kWhatsNewCommand), &made.whatsNewButton);
+    EXPECT_EQ(made.ButtonForId(HV::kResourcesCommand), &made.resourcesButton);
+    EXPECT_EQ(made.ButtonForId(HV::kCloseCommand), &made.closeButton);
+    EXPECT_EQ(made.ButtonForId(HV::kReadLicenseCommand), nullptr);
     EXPECT_EQ(made.ButtonForId(0), nullptr);
 }
 
-TEST_F(InstallerWindowTest, PutsTheStripBehindItsButtons) {
+TEST_F(InstallerWindowTest, DrawsItsButtonsOnTheColourOfTheStrip) {
     HV::InstallerWindow& made = Make();
     made.ShowFinalButtons();
     const std::set<HV::CustomButtonOwner*> owners{made.continueButton.owner, made.backButton.owner,

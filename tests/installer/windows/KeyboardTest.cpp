@@ -4,6 +4,7 @@
 #include <utility>
 #include <vector>
 
+#include "installer/windows/EULAWindow.h"
 #include "installer/windows/EULAWindowController.h"
 #include "installer/windows/InstallerWindow.h"
 #include "installer/windows/SelectionPage.h"
@@ -15,8 +16,6 @@ namespace {
 
 constexpr LPARAM kPressed = 1;
 constexpr LPARAM kReleased = static_cast<LPARAM>(0xC0000001);
-constexpr int kCloseViewer = 161;
-constexpr int kSaveLicense = 1184;
 constexpr int kAgreementItself = 0;
 
 /// Windows of the wizard, served by the loop that serves them in the program.
@@ -61,7 +60,8 @@ protected:
 };
 
 TEST_F(FirstPageKeyboardTest, TabReachesTheButtonsOfThePageToo) {
-    EXPECT_EQ(Tab(5), (std::vector<int>{1127, 1129, 1128, 1126, 1127}));
+    EXPECT_EQ(Tab(5), (std::vector<int>{HV::kReadLicenseCommand, HV::kDisagreeCommand, HV::kAgreeCommand,
+                                        HV::kCancelCommand, HV::kReadLicenseCommand}));
 }
 
 TEST_F(FirstPageKeyboardTest, SpacePressesAButton) {
@@ -74,16 +74,18 @@ TEST_F(FirstPageKeyboardTest, TabGoesOnAfterTheButtonThatDisabledItself) {
     Tab(3);
     Type(VK_RETURN);
     ASSERT_TRUE(controller.agreed);
-    EXPECT_EQ(Tab(4), (std::vector<int>{1127, 1124, 1126, 1127}));
+    EXPECT_EQ(Tab(4), (std::vector<int>{HV::kReadLicenseCommand, HV::kContinueCommand, HV::kCancelCommand,
+                                        HV::kReadLicenseCommand}));
 }
 
 TEST_F(FirstPageKeyboardTest, ArrowsGoAlongTheButtonsOfARowAndPressNothing) {
-    ::SetFocus(::GetDlgItem(*window, 1126));
+    ::SetFocus(::GetDlgItem(*window, HV::kCancelCommand));
     Type(VK_RIGHT);
-    EXPECT_EQ(Focus(), 1126) << "what is disabled is passed over";
+    EXPECT_EQ(Focus(), HV::kCancelCommand) << "what is disabled is passed over";
     ::SetFocus(controller.welcomePage->readLicenseButton.handle);
     EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_RIGHT, VK_LEFT, VK_UP, VK_UP, VK_DOWN}),
-              (std::vector<int>{1129, 1128, 1128, 1129, 1127, 1127, 1129}));
+              (std::vector<int>{HV::kDisagreeCommand, HV::kAgreeCommand, HV::kAgreeCommand, HV::kDisagreeCommand,
+                                HV::kReadLicenseCommand, HV::kReadLicenseCommand, HV::kDisagreeCommand}));
     EXPECT_FALSE(controller.agreed);
     EXPECT_EQ(toolkit.quits, std::vector<int>{});
 }
@@ -91,9 +93,10 @@ TEST_F(FirstPageKeyboardTest, ArrowsGoAlongTheButtonsOfARowAndPressNothing) {
 TEST_F(FirstPageKeyboardTest, ArrowsGoAlongTheBottomStripAsItStandsOnTheScreen) {
     toolkit.EnableWindow(HV::WizardPart::ContinueButton, true);
     toolkit.EnableWindow(HV::WizardPart::BackButton, true);
-    ::SetFocus(::GetDlgItem(*window, 1126));
+    ::SetFocus(::GetDlgItem(*window, HV::kCancelCommand));
     EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_RIGHT, VK_LEFT, VK_LEFT, VK_LEFT}),
-              (std::vector<int>{1125, 1124, 1124, 1125, 1126, 1126}));
+              (std::vector<int>{HV::kBackCommand, HV::kContinueCommand, HV::kContinueCommand, HV::kBackCommand,
+                                HV::kCancelCommand, HV::kCancelCommand}));
 }
 
 TEST_F(FirstPageKeyboardTest, ArrowsDoNothingWhereNoControlHasTheFocus) {
@@ -146,6 +149,14 @@ protected:
         toolkit.ShowWindow(HV::WizardPart::MainWindow, SW_SHOW);
     }
 
+    // The identifiers of these products' boxes.
+    static std::vector<int> Boxes(std::vector<int> products) {
+        for (int& product : products) {
+            product += HV::kFirstCheckControl;
+        }
+        return products;
+    }
+
     void StartAt(int product) const { ::SetFocus(page->CheckButtons().at(static_cast<std::size_t>(product)).handle); }
 
     HV::SelectionPage* page = nullptr;
@@ -154,15 +165,15 @@ protected:
 TEST_F(ProductsKeyboardTest, DownAndUpGoThroughTheColumns) {
     StartAt(0);
     EXPECT_EQ(Press({VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN, VK_DOWN}),
-              (std::vector<int>{1145, 1147, 1148, 1149, 1150, 1151, 1152, 1153, 1153}));
-    EXPECT_EQ(Press({VK_UP, VK_UP, VK_UP, VK_UP}), (std::vector<int>{1152, 1151, 1150, 1149}));
+              Boxes({1, 3, 4, 5, 6, 7, 8, 9, 9}));
+    EXPECT_EQ(Press({VK_UP, VK_UP, VK_UP, VK_UP}), Boxes({8, 7, 6, 5}));
 }
 
 TEST_F(ProductsKeyboardTest, RightAndLeftGoAlongARow) {
     StartAt(1);
-    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_LEFT, VK_LEFT}), (std::vector<int>{1151, 1151, 1145, 1145}));
+    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_LEFT, VK_LEFT}), Boxes({7, 7, 1, 1}));
     StartAt(5);
-    EXPECT_EQ(Press({VK_RIGHT}), std::vector<int>{1149}) << "there is no product on the right of it";
+    EXPECT_EQ(Press({VK_RIGHT}), Boxes({5})) << "there is no product on the right of it";
 }
 
 TEST_F(ProductsKeyboardTest, ArrowsChangeNoChoiceAndABlankDoes) {
@@ -174,8 +185,10 @@ TEST_F(ProductsKeyboardTest, ArrowsChangeNoChoiceAndABlankDoes) {
 }
 
 TEST_F(ProductsKeyboardTest, ArrowsKeepTheTwoButtonsApartFromTheProducts) {
-    ::SetFocus(::GetDlgItem(*page, 1130));
-    EXPECT_EQ(Press({VK_RIGHT, VK_DOWN, VK_LEFT, VK_UP}), (std::vector<int>{1131, 1131, 1130, 1130}));
+    ::SetFocus(::GetDlgItem(*page, HV::kDeselectAllControl));
+    EXPECT_EQ(Press({VK_RIGHT, VK_DOWN, VK_LEFT, VK_UP}),
+              (std::vector<int>{HV::kSelectAllControl, HV::kSelectAllControl, HV::kDeselectAllControl,
+                                HV::kDeselectAllControl}));
 }
 
 TEST_F(FirstPageKeyboardTest, EscapeDoesNothing) {
@@ -240,7 +253,8 @@ TEST_F(ViewerKeyboardTest, KeysScrollAtOnce) {
 }
 
 TEST_F(ViewerKeyboardTest, TabGoesAroundAndSelectsNothing) {
-    EXPECT_EQ(Tab(4), (std::vector<int>{kCloseViewer, kSaveLicense, kAgreementItself, kCloseViewer}));
+    EXPECT_EQ(Tab(4), (std::vector<int>{HV::kCloseViewerControl, HV::kSaveLicenseControl, kAgreementItself,
+                                        HV::kCloseViewerControl}));
     EXPECT_EQ(Selection(), std::pair(0L, 0L));
     EXPECT_EQ(HiddenRows(), 0);
     Type(VK_RETURN);
@@ -249,7 +263,8 @@ TEST_F(ViewerKeyboardTest, TabGoesAroundAndSelectsNothing) {
 
 TEST_F(ViewerKeyboardTest, ArrowsGoBetweenItsButtons) {
     Tab(1);
-    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_LEFT}), (std::vector<int>{kSaveLicense, kSaveLicense, kCloseViewer}));
+    EXPECT_EQ(Press({VK_RIGHT, VK_RIGHT, VK_LEFT}),
+              (std::vector<int>{HV::kSaveLicenseControl, HV::kSaveLicenseControl, HV::kCloseViewerControl}));
 }
 
 TEST_F(ViewerKeyboardTest, EscapeClosesTheViewerFromItsText) {

@@ -43,11 +43,12 @@ protected:
 };
 
 TEST_F(WelcomePageTest, HasItsButtonsOnOneRow) {
-    EXPECT_EQ(ControlsOf(page), (std::vector<Control>{
-                                    {1127, L"Button", L"Read License...", {0, 271, 100, 296}, 0x5001000B},
-                                    {1129, L"Button", L"Disagree", {240, 271, 310, 296}, 0x5001000B},
-                                    {1128, L"Button", L"Agree", {320, 271, 390, 296}, 0x5001000B},
-                                }));
+    EXPECT_EQ(ControlsOf(page),
+              (std::vector<Control>{
+                  {HV::kReadLicenseCommand, L"Button", L"Read License...", {0, 271, 100, 296}, 0x5001000B},
+                  {HV::kDisagreeCommand, L"Button", L"Disagree", {240, 271, 310, 296}, 0x5001000B},
+                  {HV::kAgreeCommand, L"Button", L"Agree", {320, 271, 390, 296}, 0x5001000B},
+              }));
 }
 
 TEST_F(WelcomePageTest, HasItsTexts) {

@@ -13,9 +13,6 @@ namespace {
 using HV::SelectionPage;
 using Names = std::vector<std::string>;
 
-constexpr int kDeselectAll = 1130;
-constexpr int kSelectAll = 1131;
-constexpr int kFirstBox = 1144;
 constexpr RECT kPage{170, 37, 580, 345};
 
 class SelectionPageTest : public WindowTest {
@@ -54,13 +51,17 @@ protected:
 };
 
 TEST_F(SelectionPageTest, HasTwoButtonsAndABoxForEachProduct) {
+    EXPECT_EQ(HV::kDeselectAllControl, 1130);
+    EXPECT_EQ(HV::kSelectAllControl, 1131);
+    EXPECT_EQ(HV::kFirstCheckControl, 1144);
+    EXPECT_EQ(HV::kLastCheckControl, 1164);
     MakeWithADisabledOne();
     EXPECT_EQ(ControlsOf(page), (std::vector<Control>{
-                                    {1130, L"Button", L"Deselect All", {0, 30, 70, 55}, 0x5001000B},
-                                    {1131, L"Button", L"Select All", {80, 30, 150, 55}, 0x5001000B},
-                                    {1144, L"Button", L"Glow", {10, 80, 195, 102}, 0x5001010B},
-                                    {1145, L"Button", L"Keyer", {10, 102, 195, 124}, 0x5801010B},
-                                    {1146, L"Button", L"Viewer", {10, 124, 195, 146}, 0x5001010B},
+                                    {HV::kDeselectAllControl, L"Button", L"Deselect All", {0, 30, 70, 55}, 0x5001000B},
+                                    {HV::kSelectAllControl, L"Button", L"Select All", {80, 30, 150, 55}, 0x5001000B},
+                                    {HV::kFirstCheckControl, L"Button", L"Glow", {10, 80, 195, 102}, 0x5001010B},
+                                    {HV::kFirstCheckControl + 1, L"Button", L"Keyer", {10, 102, 195, 124}, 0x5801010B},
+                                    {HV::kFirstCheckControl + 2, L"Button", L"Viewer", {10, 124, 195, 146}, 0x5001010B},
                                 }));
 }
 
@@ -68,13 +69,14 @@ TEST_F(SelectionPageTest, HasRoomForTwelveProducts) {
     Make(14);
     const std::vector<Control> controls = ControlsOf(page);
     ASSERT_EQ(controls.size(), 14U);  // two buttons, twelve boxes
-    EXPECT_EQ(controls.back(), (Control{1155, L"Button", L"Product 11", {196, 190, 381, 212}, 0x5001010B}));
+    EXPECT_EQ(controls.back(),
+              (Control{HV::kFirstCheckControl + 11, L"Button", L"Product 11", {196, 190, 381, 212}, 0x5001010B}));
     EXPECT_EQ(page.CheckButtons().size(), 12U);
 }
 
 TEST_F(SelectionPageTest, KeepsProductsWithoutABoxAsTheyCame) {
     Make(14);
-    Press(page, kDeselectAll);
+    Press(page, HV::kDeselectAllControl);
     EXPECT_EQ(page.CheckedCount(), 2);
     EXPECT_EQ(page.UncheckedIdentifiers(), (Names{"0", "1", "2", "3", "4", "5", "6", "7", "8", "9", "10", "11"}));
 }
@@ -91,7 +93,7 @@ TEST_F(SelectionPageTest, GivesEveryControlTheBodyFont) {
 
 TEST_F(SelectionPageTest, DeselectsAllThatCanBeChosen) {
     MakeWithADisabledOne();
-    Press(page, kDeselectAll);
+    Press(page, HV::kDeselectAllControl);
     EXPECT_EQ(page.CheckedCount(), 0);
     EXPECT_EQ(page.UncheckedIdentifiers(), (Names{"glow", "keyer", "viewer"}));
     ExpectBoxesToShowTheChoice();
@@ -99,8 +101,8 @@ TEST_F(SelectionPageTest, DeselectsAllThatCanBeChosen) {
 
 TEST_F(SelectionPageTest, SelectsAllButWhatCannotBeChosen) {
     MakeWithADisabledOne();
-    Press(page, kDeselectAll);
-    Press(page, kSelectAll);
+    Press(page, HV::kDeselectAllControl);
+    Press(page, HV::kSelectAllControl);
     EXPECT_EQ(page.CheckedCount(), 2);
     EXPECT_EQ(page.UncheckedIdentifiers(), Names{"keyer"});
     ExpectBoxesToShowTheChoice();
@@ -109,66 +111,66 @@ TEST_F(SelectionPageTest, SelectsAllButWhatCannotBeChosen) {
 TEST_F(SelectionPageTest, LeavesADisabledProductThatCameCheckedAlone) {
     page.AddItem({"Glow", "glow", true, false});
     ASSERT_NE(page.Create(Parent(), kPage, "", WS_CHILD | WS_VISIBLE), nullptr);
-    Press(page, kDeselectAll);
+    Press(page, HV::kDeselectAllControl);
     EXPECT_EQ(page.CheckedCount(), 1);
 }
 
 TEST_F(SelectionPageTest, TogglesAProduct) {
     MakeWithADisabledOne();
-    Press(page, kFirstBox);
+    Press(page, HV::kFirstCheckControl);
     EXPECT_EQ(page.UncheckedIdentifiers(), (Names{"glow", "keyer"}));
     ExpectBoxesToShowTheChoice();
-    Press(page, kFirstBox);
+    Press(page, HV::kFirstCheckControl);
     EXPECT_EQ(page.UncheckedIdentifiers(), Names{"keyer"});
 }
 
 TEST_F(SelectionPageTest, PaintsABoxThatWasToggled) {
     MakeWithADisabledOne();
-    ::ValidateRect(::GetDlgItem(page, kFirstBox), nullptr);
-    ASSERT_FALSE(NeedsPainting(kFirstBox));
-    Press(page, kFirstBox);
-    EXPECT_TRUE(NeedsPainting(kFirstBox));
+    ::ValidateRect(::GetDlgItem(page, HV::kFirstCheckControl), nullptr);
+    ASSERT_FALSE(NeedsPainting(HV::kFirstCheckControl));
+    Press(page, HV::kFirstCheckControl);
+    EXPECT_TRUE(NeedsPainting(HV::kFirstCheckControl));
 }
 
 TEST_F(SelectionPageTest, PaintsBoxesAtOnceWhenAllAreChanged) {
     MakeWithADisabledOne();
-    ::InvalidateRect(::GetDlgItem(page, kFirstBox), nullptr, TRUE);
-    Press(page, kDeselectAll);
-    EXPECT_FALSE(NeedsPainting(kFirstBox));
+    ::InvalidateRect(::GetDlgItem(page, HV::kFirstCheckControl), nullptr, TRUE);
+    Press(page, HV::kDeselectAllControl);
+    EXPECT_FALSE(NeedsPainting(HV::kFirstCheckControl));
 }
 
 TEST_F(SelectionPageTest, TogglesABoxAtTheSecondQuickClickToo) {
     MakeWithADisabledOne();
-    Press(page, kFirstBox);
-    Press(page, kFirstBox, BN_DOUBLECLICKED);
+    Press(page, HV::kFirstCheckControl);
+    Press(page, HV::kFirstCheckControl, BN_DOUBLECLICKED);
     EXPECT_EQ(page.UncheckedIdentifiers(), Names{"keyer"});
 }
 
 TEST_F(SelectionPageTest, TakesTheSecondQuickClickOnAButtonForNoPress) {
     MakeWithADisabledOne();
-    Press(page, kDeselectAll, BN_DOUBLECLICKED);
+    Press(page, HV::kDeselectAllControl, BN_DOUBLECLICKED);
     EXPECT_EQ(page.CheckedCount(), 2);
-    Press(page, kDeselectAll);
-    Press(page, kSelectAll, BN_DOUBLECLICKED);
+    Press(page, HV::kDeselectAllControl);
+    Press(page, HV::kSelectAllControl, BN_DOUBLECLICKED);
     EXPECT_EQ(page.CheckedCount(), 0);
 }
 
 TEST_F(SelectionPageTest, DoesNothingWhenABoxOnlyGetsTheFocus) {
     MakeWithADisabledOne();
-    Press(page, kFirstBox, BN_SETFOCUS);
+    Press(page, HV::kFirstCheckControl, BN_SETFOCUS);
     EXPECT_EQ(page.CheckedCount(), 2);
 }
 
 TEST_F(SelectionPageTest, IgnoresADisabledProduct) {
     MakeWithADisabledOne();
-    Press(page, kFirstBox + 1);
+    Press(page, HV::kFirstCheckControl + 1);
     EXPECT_EQ(page.UncheckedIdentifiers(), Names{"keyer"});
 }
 
 TEST_F(SelectionPageTest, IgnoresBoxesThatDoNotExist) {
     Make(14);
     int pressed = 0;
-    for (int identifier = kFirstBox + 12; identifier <= 1165; ++identifier) {
+    for (int identifier = HV::kFirstCheckControl + 12; identifier <= HV::kLastCheckControl + 1; ++identifier) {
         Press(page, identifier);
         EXPECT_EQ(page.CheckedCount(), 14) << identifier;
         ++pressed;
@@ -203,7 +205,7 @@ TEST_F(SelectionPageTest, LeavesItsBackgroundToTheWindowBehind) {
     EXPECT_EQ(canvas.Count(0), 100);
 }
 
-TEST_F(SelectionPageTest, HasThePageColourBehindItsButtons) {
+TEST_F(SelectionPageTest, HasThePageColourAroundItsButtons) {
     auto* const brush = static_cast<Gdiplus::SolidBrush*>(page.BackgroundBrush());
     Gdiplus::Color color;
     brush->GetColor(&color);

@@ -56,10 +56,10 @@ TEST_F(WindowsToolkitTest, EnablesAndDisablesButtons) {
     toolkit.EnableWindow(WizardPart::BackButton, true);
     toolkit.EnableWindow(WizardPart::AgreeButton, false);
     toolkit.EnableWindow(WizardPart::DisagreeButton, false);
-    EXPECT_NE(::IsWindowEnabled(::GetDlgItem(*window, 1124)), FALSE);
-    EXPECT_NE(::IsWindowEnabled(::GetDlgItem(*window, 1125)), FALSE);
-    EXPECT_EQ(::IsWindowEnabled(ButtonOfPage(1128)), FALSE);
-    EXPECT_EQ(::IsWindowEnabled(ButtonOfPage(1129)), FALSE);
+    EXPECT_NE(::IsWindowEnabled(::GetDlgItem(*window, HV::kContinueCommand)), FALSE);
+    EXPECT_NE(::IsWindowEnabled(::GetDlgItem(*window, HV::kBackCommand)), FALSE);
+    EXPECT_EQ(::IsWindowEnabled(ButtonOfPage(HV::kAgreeCommand)), FALSE);
+    EXPECT_EQ(::IsWindowEnabled(ButtonOfPage(HV::kDisagreeCommand)), FALSE);
 }
 
 TEST_F(WindowsToolkitTest, PassesOverPartsThatHaveNotBeenMade) {
@@ -78,7 +78,7 @@ TEST_F(WindowsToolkitTest, ChangesTheContinueButton) {
 }
 
 TEST_F(WindowsToolkitTest, GivesTheFocusToTheWindowWhenItsControlIsDisabled) {
-    const HWND agree = ButtonOfPage(1128);
+    const HWND agree = ButtonOfPage(HV::kAgreeCommand);
     ::SetFocus(agree);
     ASSERT_EQ(::GetFocus(), agree);
     toolkit.EnableWindow(WizardPart::AgreeButton, false);
@@ -86,13 +86,13 @@ TEST_F(WindowsToolkitTest, GivesTheFocusToTheWindowWhenItsControlIsDisabled) {
 }
 
 TEST_F(WindowsToolkitTest, GivesTheFocusToTheWindowWhenItsPageIsHidden) {
-    ::SetFocus(ButtonOfPage(1128));
+    ::SetFocus(ButtonOfPage(HV::kAgreeCommand));
     toolkit.ShowWindow(WizardPart::WelcomePage, SW_HIDE);
     EXPECT_EQ(::GetFocus(), window->m_hWnd);
 }
 
 TEST_F(WindowsToolkitTest, LeavesTheFocusWhereItCanBeUsed) {
-    const HWND agree = ButtonOfPage(1128);
+    const HWND agree = ButtonOfPage(HV::kAgreeCommand);
     ::SetFocus(agree);
     toolkit.EnableWindow(WizardPart::ContinueButton, true);
     EXPECT_EQ(::GetFocus(), agree);
