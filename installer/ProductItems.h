@@ -3,7 +3,7 @@
 #include <string>
 #include <vector>
 
-/// The products that the user chooses from, and what is chosen. No window in sight.
+/// The products that the user chooses from, and what is chosen. No window is needed.
 namespace HV {
 
 /// One product on the selection page.

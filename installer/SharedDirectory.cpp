@@ -69,7 +69,8 @@ void LetUsersInto(HANDLE folder) {
 
 }  // namespace
 
-// A folder that was there before belongs to whoever made it, and so does the decision who may write into it.
+// A folder that was there before belongs to the user who made it, and so does the decision which users may write into
+// it.
 void CreateSharedDirectory(const std::string& path) {
     const fs::path folder(path);
     if (!CreateDirectoryW(folder.c_str(), nullptr)) {

@@ -27,7 +27,7 @@ void WinWizardController::MakeWindow(const std::string& caption, int showCommand
 }
 
 // These boxes have no owner, so the window behind them takes presses. None of these is a command yet: packages that
-// have been refused must not be installed from behind the box that refuses them.
+// have been refused must not be installed while the box that refuses them is open.
 void WinWizardController::CheckPackagesAndHosts() {
     if (!model_.valid) {
         EndWithInvalidPackages();

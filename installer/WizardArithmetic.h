@@ -2,7 +2,7 @@
 
 #include "platform/rectangle.h"
 
-/// The arithmetic of the wizard's windows, in pixels: where things stand and how far they reach. No window in sight.
+/// The arithmetic of the wizard's windows, in pixels: where things stand and how far they reach. It makes no window.
 namespace HV {
 
 /// One step of a window's widening.

@@ -14,7 +14,7 @@ void WinWizardController::RequireManagerClosed() {
 }
 
 // The hosts of all packages count, those of unchecked products too. A process without a name, which the search for
-// HitFilm finds, makes the text's builder throw, and nobody catches that: there is no name to ask the user about.
+// HitFilm finds, makes RunningHostsText() throw, and nothing catches that: there is no name to ask the user about.
 void WinWizardController::RequireHostsClosed() {
     std::vector<ProcessRecord> running;
     while (model_.FindRunningHosts(running) && AskToRetry("Host applications running.", RunningHostsText(running))) {

@@ -97,8 +97,8 @@ void WinWizardController::BackCommand() {
     state = WizardState::Welcome;
 }
 
-// The engine is asked to stop and not waited for: who cancels wants to be out now. The end of the process may cut the
-// undoing off.
+// The engine is asked to stop and not waited for: a user who cancels wants to be out now. The end of the process may
+// cut the undoing off.
 void WinWizardController::CancelCommand() {
     if (state == WizardState::Installing && job != nullptr && job->cli != nullptr) {
         job->cli->Cancel();

@@ -208,7 +208,7 @@ void WindowsToolkit::ExitProcess(unsigned status) {
 }
 
 void EndProcess(unsigned status) {
-    // An engine may be at work on its thread, which nobody waits for. An orderly end would tear down what that thread
+    // An engine may be at work on its thread, which nothing waits for. An orderly end would tear down what that thread
     // uses while it runs, or wait for a lock that it holds until a script has ended. So the process ends here and now.
     // Nothing but these two streams holds anything back.
     std::fflush(stdout);

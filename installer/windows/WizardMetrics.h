@@ -21,9 +21,9 @@ struct WizardMetrics {
     static const WizardMetrics& Instance();
 
     // Red, green, blue.
-    static constexpr unsigned PageColor = 0x1A1A1A;   // the upper part of the window, pages, behind text
+    static constexpr unsigned PageColor = 0x1A1A1A;   // the upper part of the window, pages, background of text
     static constexpr unsigned BarColor = 0x222222;    // the bottom strip
-    static constexpr unsigned LightColor = 0xDEDEDE;  // behind the agreement
+    static constexpr unsigned LightColor = 0xDEDEDE;  // background of the agreement
     static constexpr unsigned TextColor = 0xF0F0F0;
     static constexpr unsigned DisabledTextColor = 0x646464;
     static constexpr unsigned FaceColor = 0x434343;  // buttons

@@ -53,7 +53,7 @@ std::wstring SystemName(const std::wstring& full) {
     return full.starts_with(L"\\\\") ? L"\\??\\UNC\\" + full.substr(2) : L"\\??\\" + full;
 }
 
-/// Makes the folder and opens it in one step, so nobody comes between. Whoever opens it may not delete or rename it.
+/// Makes the folder and opens it in one step, so nobody comes between. Others that open it may not delete or rename it.
 NTSTATUS Make(const std::wstring& path, PSECURITY_DESCRIPTOR rights, HANDLE& folder) {
     std::wstring name = SystemName(FullPath(path));
     UNICODE_STRING text{};

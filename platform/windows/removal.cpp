@@ -68,7 +68,7 @@ bool IsOwnName(std::wstring_view name) {
 bool Empty(HANDLE folder);
 
 bool RemoveIn(HANDLE parent, std::wstring name, bool isFolder) {
-    // Whoever may delete a folder need not be allowed to look into it; an empty one goes all the same.
+    // A user who may delete a folder need not be allowed to look into it; an empty one goes all the same.
     Handle item = OpenIn(parent, name, isFolder ? FILE_LIST_DIRECTORY : 0);
     if (!item.IsOpen() && isFolder) {
         item = OpenIn(parent, name, 0);

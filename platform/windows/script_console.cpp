@@ -110,20 +110,20 @@ void OpenMissingStandardStreams() {
 
 WindowlessConsole::WindowlessConsole() {
     if (!HasConsole()) {
-        StartBearer();
+        StartOwner();
     }
 }
 
 WindowlessConsole::~WindowlessConsole() {
-    LetBearerGo();
+    ReleaseOwner();
 }
 
-void WindowlessConsole::LetBearerGo() {
+void WindowlessConsole::ReleaseOwner() {
     Close(input_);
-    Close(bearer_);
+    Close(owner_);
 }
 
-void WindowlessConsole::StartBearer() {
+void WindowlessConsole::StartOwner() {
     SECURITY_ATTRIBUTES inherited{sizeof inherited, nullptr, TRUE};
     HANDLE itsInput = nullptr;
     if (::CreatePipe(&itsInput, &input_, &inherited, 0) == FALSE) {
@@ -132,15 +132,15 @@ void WindowlessConsole::StartBearer() {
     ::SetHandleInformation(input_, HANDLE_FLAG_INHERIT, 0);
     HANDLE nowhere = NullDevice(inherited);
     const PROCESS_INFORMATION made = StartCommandProcessor(itsInput, nowhere);
-    bearer_ = made.hProcess;
-    bearerId_ = made.dwProcessId;
+    owner_ = made.hProcess;
+    ownerId_ = made.dwProcessId;
     Close(itsInput);
     Close(nowhere);
 }
 
 bool WindowlessConsole::Join() {
-    const bool joined = HasConsole() || JoinBearer();
-    LetBearerGo();
+    const bool joined = HasConsole() || JoinOwner();
+    ReleaseOwner();
     if (joined) {
         return true;
     }
@@ -151,9 +151,9 @@ bool WindowlessConsole::Join() {
     return true;
 }
 
-bool WindowlessConsole::JoinBearer() const {
-    for (int tried = 0; bearer_ != nullptr && tried < kTries; ++tried) {
-        if (::AttachConsole(bearerId_) != FALSE) {
+bool WindowlessConsole::JoinOwner() const {
+    for (int tried = 0; owner_ != nullptr && tried < kTries; ++tried) {
+        if (::AttachConsole(ownerId_) != FALSE) {
             return true;
         }
         // A program may have been given a console that leads nowhere; it lets go of that first.
@@ -161,7 +161,7 @@ bool WindowlessConsole::JoinBearer() const {
             ::FreeConsole();
         }
         // Not yet: the command processor has to come to life first. If it ends, it never will.
-        if (::WaitForSingleObject(bearer_, kBetweenTries) == WAIT_OBJECT_0) {
+        if (::WaitForSingleObject(owner_, kBetweenTries) == WAIT_OBJECT_0) {
             return false;
         }
     }

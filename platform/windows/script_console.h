@@ -34,12 +34,12 @@ public:
     bool Join();
 
 private:
-    void StartBearer();
-    [[nodiscard]] bool JoinBearer() const;
-    void LetBearerGo();
+    void StartOwner();
+    [[nodiscard]] bool JoinOwner() const;
+    void ReleaseOwner();
 
-    HANDLE bearer_ = nullptr;  // the command processor
-    DWORD bearerId_ = 0;
+    HANDLE owner_ = nullptr;  // the command processor, whose console this is
+    DWORD ownerId_ = 0;
     HANDLE input_ = nullptr;  // it waits for what is written here
 };
 

@@ -2,7 +2,7 @@
 
 /// The system's headers for sources that make windows and draw in them: the windows of the wizard and what serves them.
 ///
-/// They need the drawing interface, which the flags of all other rooms leave out. Whoever includes this links
+/// They need the drawing interface, which the flags of all other rooms leave out. A source that includes this links
 /// hv_window, which puts it back.
 #ifdef NOGDI
 #error "windows are drawn: link hv_window"

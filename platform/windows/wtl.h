@@ -13,7 +13,7 @@ class CMessageLoop {
 public:
     /// Serves the windows of the calling thread until somebody calls PostQuitMessage, and gives the exit value of that
     /// call. Throws what a message handler of a window has thrown: an error that nothing catches ends a program with
-    /// windows as it ends any other, and leaves no window behind that half works.
+    /// windows as it ends any other, and no window stays open that half works.
     int Run();
 
 private:

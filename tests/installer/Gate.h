@@ -7,8 +7,8 @@
 
 /// Holds a thread at a chosen place of what it says, so that a test can look at a run that stands still.
 ///
-/// The thread passes every text through; whoever chose one waits until the thread is there, and lets it go on. Nobody
-/// waits longer than a minute.
+/// The thread passes every text through; the test that chose one waits until the thread is there, and lets it go on.
+/// Nobody waits longer than a minute.
 class Gate {
 public:
     void HoldAt(const std::string& text) {

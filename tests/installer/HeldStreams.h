@@ -36,8 +36,8 @@ private:
     std::string line_;
 };
 
-/// Holds whoever logs a message to "hvdeploy-detail" at the gate, behind the moment in which the line was written by
-/// those who record it or before. No other thread may log meanwhile: it would wait too.
+/// Holds a thread that logs a message to "hvdeploy-detail" at the gate, before or after others that record the line
+/// have written it. No other thread may log meanwhile: it would wait too.
 class HeldLog {
 public:
     HeldLog() : appender_(new Holder(gate)) { HVL::Log::Detail().addAppender(appender_); }

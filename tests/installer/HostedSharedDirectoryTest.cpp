@@ -33,7 +33,7 @@ private:
     mode_t before_;
 };
 
-TEST(HostedSharedDirectory, IsOpenToEverybodyWhoeverMakesIt) {
+TEST(HostedSharedDirectory, IsOpenToEverybodyWhicheverUserMakesIt) {
     Machine machine;
     const PrivateMaker maker;
     HV::CreateSharedDirectory(kFolder);
@@ -108,7 +108,7 @@ TEST(HostedAccess, KnowsNoGroupButUsersAndNoRightButAll) {
     PSID administrators = nullptr;
     PSID users = nullptr;
     ASSERT_TRUE(AllocateAndInitializeSid(&authority, 2, 32, 544, 0, 0, 0, 0, 0, 0, &administrators));
-    // Numbers behind the count do not count.
+    // Numbers after the count do not count.
     ASSERT_TRUE(AllocateAndInitializeSid(&authority, 2, 32, 545, 7, 7, 7, 7, 7, 7, &users));
     EXPLICIT_ACCESS_W entry = {};
     entry.grfAccessPermissions = GENERIC_ALL;

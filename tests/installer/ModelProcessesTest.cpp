@@ -17,8 +17,8 @@ protected:
         model.packages.push_back(package);
     }
 
-    /// The names of the running hosts on drive C. What runs outside of the machine may be a host too, of whoever works
-    /// on this computer.
+    /// The names of the running hosts on drive C. What runs outside of the machine may be a host too, of somebody who
+    /// works on this computer.
     Names Found() {
         std::vector<HV::ProcessRecord> found;
         const bool any = model.FindRunningHosts(found);

@@ -65,7 +65,7 @@ TEST_F(RunningHosts, AreReachedWhenTheManagerHasGoneAtARetry) {
     EXPECT_EQ(wizard.state, WizardState::Installing);
 }
 
-TEST_F(RunningHosts, AreLookedForBehindTheManager) {
+TEST_F(RunningHosts, AreLookedForAfterTheManager) {
     RunningProgram manager(machine, kManager);
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
@@ -137,7 +137,7 @@ TEST_F(RunningHosts, CountWithoutTheirProductsBeingChosen) {
     EXPECT_EQ(toolkit.boxes, std::vector{kAfterEffectsRuns});
 }
 
-TEST_F(RunningHosts, AreLookedForBehindTheChoice) {
+TEST_F(RunningHosts, AreLookedForAfterTheChoice) {
     const RunningProgram host(machine, kAfterEffects);
     GoToSelection();
     toolkit.DeselectAll();

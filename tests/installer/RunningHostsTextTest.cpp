@@ -21,7 +21,7 @@ TEST(RunningHostsText, NamesOneHost) {
               "cancel to exit the installer.");
 }
 
-TEST(RunningHostsText, NamesTwoHostsAndLacksABlankBehindThem) {
+TEST(RunningHostsText, NamesTwoHostsAndLacksABlankAfterThem) {
     EXPECT_EQ(TextFor({"AfterFX.exe", "Resolve.exe"}),
               "After Effects and Resolve are host applications for products in the installer; please quit these "
               "applications and retryor cancel to exit the installer.");

@@ -118,7 +118,7 @@ TEST_F(ScanTest, ATextThatIsNoJsonObjectIsRefused) {
         "\"text\"",
         "{\"identifier\": \"com.halvorn.suite\"",
         "nonsense",
-        "\xEF\xBB\xBF{\"display_name\": \"behind a byte-order mark\"}",
+        "\xEF\xBB\xBF{\"display_name\": \"after a byte-order mark\"}",
         "{\"number\": 1e999}",
         "{\"installed_file_paths\": [1]}",
         std::string(10'000'000, '['),  // NOLINT(bugprone-string-constructor): ten megabytes are meant.

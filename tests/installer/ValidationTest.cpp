@@ -143,7 +143,7 @@ TEST_F(ValidationTest, APackageWithoutAPayloadsSourceIsRefusedThoughItsDigestIsR
         "Error in package com.halvorn.glow.hvpkg- cannot find source for payload payload-1, source not there"));
 }
 
-// Whoever can make another file for an MD5 cannot make it for both.
+// An attacker that can make another file for an MD5 cannot make it for both.
 TEST_F(ValidationTest, APackageIsRefusedWhoseFirstDigestAloneIsRight) {
     const std::string name = setup.Has(Product("glow"));
     const HV::FileDigests digests = HV::HeldFile(fs::path(InPackages(name))).Digests();
@@ -166,7 +166,7 @@ TEST_F(ValidationTest, APackageIsRefusedWhoseSecondDigestIsInUpperCase) {
     ExpectRefused(DetailError("validation of com.halvorn.glow.hvpkg failed."));
 }
 
-TEST_F(ValidationTest, APackageThatGoesBehindTheScanIsRefused) {
+TEST_F(ValidationTest, APackageThatGoesAfterTheScanIsRefused) {
     const std::string name = setup.Ships(Product("glow"));
     setup.WhenTheTableIsAsked([&] { HVL::FileUtils::DeleteFileOrDirectory(InPackages(name)); });
     ExpectRefused(DetailError("validation of com.halvorn.glow.hvpkg failed."));
@@ -179,7 +179,7 @@ TEST_F(ValidationTest, APackageThatGoesIsRefusedEvenWhereNoDataHasTheRightDigest
     ExpectRefused(DetailError("File not found at path " + InPackages(name)));
 }
 
-TEST_F(ValidationTest, AFolderThatGoesBehindTheScanIsRefused) {
+TEST_F(ValidationTest, AFolderThatGoesAfterTheScanIsRefused) {
     setup.Ships(Product("glow"));
     setup.WhenTheTableIsAsked([] { HVL::FileUtils::DeleteFileOrDirectory(kPackages); });
     ExpectRefused(DetailError("validation of com.halvorn.glow.hvpkg failed."));

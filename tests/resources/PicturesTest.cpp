@@ -103,7 +103,7 @@ TEST(Pictures, TheFinalPictureNamesNoSuiteAndPromisesNothing) {
     EXPECT_EQ(source.find("complete"), std::string::npos);
 }
 
-// The one button that is lit says where to go on; what is warm in the banner stays behind it.
+// The one button that is lit says where to go on; the warm colours of the banner are weaker.
 TEST(Pictures, TheBannersAmberIsQuieterThanTheLitButton) {
     constexpr double kLitButton = Brightness(0x009FE1);
     const Bitmap banner("banner.bmp");

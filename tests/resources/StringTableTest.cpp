@@ -8,7 +8,7 @@
 
 namespace {
 
-/// Key, with the operating system behind it where one is named, to text.
+/// Key, with the operating system after it where one is named, to text.
 using Texts = std::map<std::string, std::string>;
 
 Texts TextsOf(const TiXmlElement& strings) {

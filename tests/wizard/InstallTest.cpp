@@ -8,7 +8,7 @@
 
 namespace {
 
-/// What an installation has left behind.
+/// What an installation has left on the machine.
 struct Left {
     std::map<std::string, std::string> files;
     std::string registry;

@@ -65,13 +65,13 @@ Mark ImageWithin(const std::string& hostPath, const RECT& part) {
     return {hostPath + At(part), [=](const Picture& picture) { return picture.Holds(image, part); }};
 }
 
-Mark Button(const std::string& text, const RECT& part, Color face, Color behind) {
+Mark Button(const std::string& text, const RECT& part, Color face, Color background) {
     const Color color = face == DisabledFace ? DisabledText : Text;
     const Mark words = Words(text, Inset(part, 3), Body, InTheMiddle, color, face);
-    return {"a button with " + words.description + ", corners on " + Hex(behind), [=](const Picture& picture) {
+    return {"a button with " + words.description + ", corners on " + Hex(background), [=](const Picture& picture) {
                 return words.isIn(picture) && HasFace(picture, part, face) &&
-                       picture.IsAll({part.right - 1, part.top, part.right, part.bottom}, behind) &&
-                       picture.IsAll({part.left, part.bottom - 1, part.right, part.bottom}, behind);
+                       picture.IsAll({part.right - 1, part.top, part.right, part.bottom}, background) &&
+                       picture.IsAll({part.left, part.bottom - 1, part.right, part.bottom}, background);
             }};
 }
 

@@ -50,7 +50,7 @@ Mark Filled(const RECT& part, Color color);
 /// The rectangle holds this text and nothing else, letter for letter.
 Mark Words(const std::string& text, const RECT& part, Font font, unsigned format, Color color, Color background);
 
-/// The rectangle holds as much of this text as one line has room for, and three dots behind it.
+/// The rectangle holds as much of this text as one line has room for, and three dots after it.
 Mark WordsInOneLine(const std::string& text, const RECT& part, Font font, unsigned format, Color color,
                     Color background);
 
@@ -60,8 +60,8 @@ Mark Image(const std::string& hostPath, int left, int top);
 Mark ImageWithin(const std::string& hostPath, const RECT& part);
 
 /// A rounded button with this text: its face, its rounded corners and the strip at its right and bottom edges, where
-/// `behind` shows.
-Mark Button(const std::string& text, const RECT& part, Color face, Color behind);
+/// `background` shows.
+Mark Button(const std::string& text, const RECT& part, Color face, Color background);
 
 /// A check box of the selection page: its bitmap and its label.
 Mark CheckBox(const std::string& text, const RECT& part, bool checked, bool enabled);

@@ -30,7 +30,7 @@ void SayThatItWaits() {
     }
 }
 
-/// What stands behind the program's own name.
+/// What stands after the program's own name.
 std::string Arguments(const std::string& line) {
     const std::size_t end = line[0] == '"' ? line.find('"', 1) + 1 : line.find(' ');
     return end < line.size() ? line.substr(end) : "";

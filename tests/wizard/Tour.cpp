@@ -58,7 +58,7 @@ testing::AssertionResult Comes(RunningWizard& wizard, const std::function<bool()
                                        << said;
 }
 
-/// The page with this control, or null behind a failed wait for it.
+/// The page with this control, or null after a failed wait for it.
 HWND PageThatComesWith(RunningWizard& wizard, int control) {
     HWND page = nullptr;
     EXPECT_TRUE(Comes(wizard,

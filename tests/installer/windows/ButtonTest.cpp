@@ -19,7 +19,7 @@ using HV::WizardMetrics;
 constexpr int kWidth = 80;
 constexpr int kHeight = 25;
 constexpr RECT kPlace{0, 0, kWidth, kHeight};
-constexpr unsigned kBehind = 0xABCDEF;
+constexpr unsigned kBackground = 0xABCDEF;
 constexpr UINT kDisabledState = ODS_DISABLED;
 
 /// An owner without a brush.
@@ -31,8 +31,8 @@ public:
 class ButtonTest : public WindowTest {
 protected:
     ButtonTest() {
-        const Gdiplus::SolidBrush behind(Gdiplus::Color(HV::OpaqueOf(kBehind)));
-        owner = std::make_unique<HV::WindowCustomButtonOwner>(behind);
+        const Gdiplus::SolidBrush background(Gdiplus::Color(HV::OpaqueOf(kBackground)));
+        owner = std::make_unique<HV::WindowCustomButtonOwner>(background);
         button.owner = owner.get();
         HV::MakeButton(button, Parent(), "", 5, kPlace);
     }
@@ -84,8 +84,8 @@ TEST_F(ButtonTest, LooksTheSamePressedAndFocused) {
 
 TEST_F(ButtonTest, LeavesAStripOfTheBackgroundOnTheRightAndBelow) {
     Draw();
-    EXPECT_TRUE(canvas.IsFilled({kWidth - 1, 0, kWidth, kHeight}, kBehind));
-    EXPECT_TRUE(canvas.IsFilled({0, kHeight - 1, kWidth, kHeight}, kBehind));
+    EXPECT_TRUE(canvas.IsFilled({kWidth - 1, 0, kWidth, kHeight}, kBackground));
+    EXPECT_TRUE(canvas.IsFilled({0, kHeight - 1, kWidth, kHeight}, kBackground));
     EXPECT_EQ(canvas.At(kWidth - 2, kHeight / 2), WizardMetrics::FaceColor);
     EXPECT_EQ(canvas.At(kWidth / 2, kHeight - 2), WizardMetrics::FaceColor);
     EXPECT_EQ(canvas.At(0, kHeight / 2), WizardMetrics::FaceColor);
@@ -94,10 +94,10 @@ TEST_F(ButtonTest, LeavesAStripOfTheBackgroundOnTheRightAndBelow) {
 
 TEST_F(ButtonTest, ShowsTheOwnersBackgroundInItsCorners) {
     Draw();
-    EXPECT_EQ(canvas.At(0, 0), kBehind);
-    EXPECT_EQ(canvas.At(kWidth - 2, 0), kBehind);
-    EXPECT_EQ(canvas.At(0, kHeight - 2), kBehind);
-    EXPECT_EQ(canvas.At(kWidth - 2, kHeight - 2), kBehind);
+    EXPECT_EQ(canvas.At(0, 0), kBackground);
+    EXPECT_EQ(canvas.At(kWidth - 2, 0), kBackground);
+    EXPECT_EQ(canvas.At(0, kHeight - 2), kBackground);
+    EXPECT_EQ(canvas.At(kWidth - 2, kHeight - 2), kBackground);
 }
 
 TEST_F(ButtonTest, HasBlackCornersWithoutAnOwner) {
@@ -119,8 +119,8 @@ TEST_F(ButtonTest, HasBlackCornersWhenTheOwnerHasNoBrush) {
 TEST_F(ButtonTest, HasAnOutlineThatDoesNotShow) {
     Draw();
     const int face = canvas.Count(WizardMetrics::FaceColor);
-    const int behind = canvas.Count(kBehind);
-    EXPECT_EQ(face + behind, kWidth * kHeight);
+    const int background = canvas.Count(kBackground);
+    EXPECT_EQ(face + background, kWidth * kHeight);
 }
 
 TEST_F(ButtonTest, HasAnOutlineInTheColourThatIsAskedFor) {
@@ -129,7 +129,7 @@ TEST_F(ButtonTest, HasAnOutlineInTheColourThatIsAskedFor) {
     const Gdiplus::SolidBrush brush(Gdiplus::Color(HV::OpaqueOf(WizardMetrics::FaceColor)));
     HV::FillRoundedRect(graphics, brush, {0, 0, kWidth, kHeight}, 0xFFFF0000);
     EXPECT_GT(canvas.Count(0xFF0000), 150);
-    // One pixel wide: the face begins right behind it.
+    // One pixel wide: the face begins right after it.
     EXPECT_EQ(canvas.At(kWidth / 2, 0), 0xFF0000U);
     EXPECT_EQ(canvas.At(kWidth / 2, 1), WizardMetrics::FaceColor);
 }
