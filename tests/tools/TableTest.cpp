@@ -22,11 +22,11 @@ constexpr const char* kOut = R"(C:\out\rows.cpp)";
 
 const std::string kOddFile =
     "Gr\xC3\xB6\xC3\x9F"
-    "e, 100% (1)$x;y.zip";
+    "e, 100 (1)$x;y.zip";
 const std::string kOddName = R"("Glow\Flare" ??/ 50% %s )"
                              "\xC3\xBC"
                              "2";
-const std::string kOddVersion = R"(1.0 "b\n")";
+const std::string kOddVersion = "1.0 'b', \xC3\xA4";
 
 PackageBuilder Product(const std::string& name) {
     return PackageBuilder("com.halvorn." + name)
@@ -120,7 +120,8 @@ TEST_F(TableTest, PassesOverOtherFilesAndFolders) {
     (void)Ships(Product("glow"));
     (void)Product("flare").WriteTo(R"(C:\packages\below)");
     machine.HasFolder(R"(C:\packages\folder.zip)");
-    machine.Has(R"(C:\packages\suite.json)", "{}");
+    machine.Has(R"(C:\packages\suite.json)",
+                R"({"identifier": "com.halvorn.suite", "version": "1", "display_name": "Suite", "product_type": "0"})");
     machine.Has(R"(C:\packages\notes.txt)", "no package");
     ASSERT_EQ(Table(), 0) << err;
     EXPECT_NE(out.find("std::array<HV::ValidationRow, 1> kRows"), std::string::npos) << out;
@@ -149,7 +150,7 @@ TEST_F(TableTest, TellsAChangedByteByTheDigestAlone) {
 }
 
 TEST_F(TableTest, IsTheSourceThatIsCompiledIntoThisProgram) {
-    (void)Ships(PackageBuilder("com.halvorn.\"odd\"")
+    (void)Ships(PackageBuilder("com.halvorn. {odd}")
                     .Named(kOddFile)
                     .Version(kOddVersion)
                     .Policy("show", "true")
@@ -168,7 +169,7 @@ TEST_F(TableTest, KeepsOddTextsThroughTheCompiler) {
     HV::ValidationInfo info;
     HV::GetValidationInfo(kOddFile, info);
     EXPECT_EQ(info.displayName, kOddName);
-    EXPECT_EQ(info.productId, "com.halvorn.\"odd\"");
+    EXPECT_EQ(info.productId, "com.halvorn. {odd}");
     EXPECT_EQ(info.version, kOddVersion);
     EXPECT_EQ(HV::SecondDigestOf(kOddFile).size(), 64U);
 }

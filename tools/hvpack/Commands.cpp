@@ -10,6 +10,7 @@
 #include "tools/hvpack/Doubts.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/PackageMaker.h"
+#include "tools/hvpack/ReleaseNames.h"
 #include "tools/hvpack/ReleaseTable.h"
 #include "tools/hvpack/SoundPackage.h"
 
@@ -18,7 +19,7 @@ namespace {
 
 constexpr const char* kUsage =
     "usage: hvpack make FOLDER OUT.hvpkg   make a package of a folder that holds a _hvmanifest.xml\n"
-    "       hvpack check FILE...           check packages as the installer does\n"
+    "       hvpack check FILE...           check packages, and suite files (.json)\n"
     "       hvpack list FILE               list what a package holds, folders first\n"
     "       hvpack table FOLDER [OUT.cpp]  write the validation table of a release, a C++ source\n";
 
@@ -80,8 +81,16 @@ bool Make(const Arguments& arguments, std::ostream& out, std::ostream& err) {
     });
 }
 
+bool IsSuiteFile(const fs::path& file) {
+    return file.extension().string() == ".json";
+}
+
 bool CheckOne(const std::string& file, std::ostream& out, std::ostream& err) {
-    Warn(SoundPackage(file).manifest, file, err);
+    if (IsSuiteFile(fs::path(file))) {
+        RefuseUnlessSuite(file);
+    } else {
+        Warn(SoundPackage(file).manifest, file, err);
+    }
     out << "OK " << file << '\n';
     return true;
 }
@@ -109,7 +118,21 @@ bool List(const Arguments& arguments, std::ostream& out, std::ostream& err) {
     return true;
 }
 
-/// Rows for all packages that are sound, and whether that is every one of them.
+/// Whether every suite file of the folder is one. A folder without any is a release all the same.
+bool CheckSuites(const fs::path& folder, std::ostream& err) {
+    bool sound = true;
+    for (const fs::directory_entry& entry : fs::directory_iterator(folder)) {
+        if (IsSuiteFile(entry.path())) {
+            sound &= Report(err, [&] {
+                RefuseUnlessSuite(entry.path().string());
+                return true;
+            });
+        }
+    }
+    return sound;
+}
+
+/// Rows for all packages that are sound, and whether that is every one of them, and the suite too.
 bool ReadRelease(const fs::path& folder, std::vector<ReleaseRow>& rows, std::ostream& err) {
     bool sound = true;
     for (const fs::path& package : PackagesIn(folder)) {
@@ -118,7 +141,7 @@ bool ReadRelease(const fs::path& folder, std::vector<ReleaseRow>& rows, std::ost
             return true;
         });
     }
-    return sound;
+    return CheckSuites(folder, err) && sound;
 }
 
 void PrintSource(const std::string& source, std::ostream& out) {

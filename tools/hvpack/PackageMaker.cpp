@@ -12,6 +12,7 @@
 #include "package/Package.h"
 #include "platform/libraries.h"
 #include "tools/hvpack/PackageError.h"
+#include "tools/hvpack/ReleaseNames.h"
 #include "tools/hvpack/SoundPackage.h"
 #include "tools/hvpack/WideCount.h"
 
@@ -194,6 +195,7 @@ HV::Manifest WriteAndCheck(const std::vector<Item>& items, const fs::path& outpu
     if (!IsSound(package)) {
         throw PackageError(output.filename().string() + " would not be a sound package");
     }
+    RefuseUnsafeNames(output.filename().string(), package.manifest);
     fs::rename(unfinished, output);
     return std::move(package.manifest);
 }

@@ -5,7 +5,8 @@
 
 namespace HVPack {
 
-/// Makes a package of all that is in `folder`, and puts it at `output` when the engine's own check has found it sound.
+/// Makes a package of all that is in `folder`, and puts it at `output` when the engine's own check has found it sound
+/// and its names are those that a release may have.
 ///
 /// The same folder gives the same bytes, whenever and wherever: entries are sorted by name, carry one fixed time and no
 /// attributes of their files, and every folder has an entry. The package is written into a folder of its own beside

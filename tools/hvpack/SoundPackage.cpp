@@ -2,6 +2,7 @@
 
 #include "package/ZipEntries.h"
 #include "tools/hvpack/PackageError.h"
+#include "tools/hvpack/ReleaseNames.h"
 
 namespace HVPack {
 
@@ -22,6 +23,7 @@ HV::Package SoundPackage(const std::string& file) {
     if (!IsSound(package)) {
         throw PackageError(file + " is not a sound package");
     }
+    RefuseUnsafeNames(package.zipPath.filename().string(), package.manifest);
     return package;
 }
 
