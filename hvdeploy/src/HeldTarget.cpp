@@ -16,6 +16,10 @@ fs::path Nearest(fs::path folder) {
 }  // namespace
 
 bool HeldTarget::HoldNearest(const fs::path& folder) {
+    if (held_ && folder == path_) {
+        // It is there as long as it is held: a folder of many files is asked for once.
+        return true;
+    }
     const fs::path nearest = Nearest(folder);
     if (held_ && nearest == path_) {
         return true;

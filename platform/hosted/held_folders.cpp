@@ -18,7 +18,9 @@ HeldFolders& HeldFolders::All() {
 
 void HeldFolders::Add(std::string hostPath, int descriptor) {
     const std::lock_guard guard(mutex_);
-    folders_.push_back({std::move(hostPath), descriptor});
+    // By the number of the process and not as "self": a script is another process.
+    folders_.push_back(
+        {std::move(hostPath), descriptor, "/proc/" + std::to_string(getpid()) + "/fd/" + std::to_string(descriptor)});
     ++count_;
 }
 
@@ -43,23 +45,17 @@ std::string HeldFolders::Through(std::string hostPath) const {
     if (nearest == nullptr) {
         return hostPath;
     }
-    return OpenName(*nearest) + hostPath.substr(nearest->hostPath.size());
+    return nearest->openName + hostPath.substr(nearest->hostPath.size());
 }
 
 std::string HeldFolders::Back(std::string hostPath) const {
     const std::lock_guard guard(mutex_);
     for (const Held& held : folders_) {
-        const std::string name = OpenName(held);
-        if (IsBelow(hostPath, name)) {
-            return held.hostPath + hostPath.substr(name.size());
+        if (IsBelow(hostPath, held.openName)) {
+            return held.hostPath + hostPath.substr(held.openName.size());
         }
     }
     return hostPath;
-}
-
-// By the number of the process and not as "self": a script is another process.
-std::string HeldFolders::OpenName(const Held& held) {
-    return "/proc/" + std::to_string(getpid()) + "/fd/" + std::to_string(held.descriptor);
 }
 
 }  // namespace hosted

@@ -26,9 +26,8 @@ private:
     struct Held {
         std::string hostPath;
         int descriptor;
+        std::string openName;  // by which everybody reaches what lies in the folder
     };
-
-    [[nodiscard]] static std::string OpenName(const Held& held);
 
     std::atomic<int> count_{0};
     mutable std::mutex mutex_;
