@@ -41,12 +41,16 @@ demo-windows: setup
 demo-windows-line: setup
 	@scripts/demo windows
 
+# A relative SUITE counts from the folder of whoever calls, which with `make -C` is another than this one.
+CALLER := $(or $(PWD),$(CURDIR))
+SUITE_FOLDER = $(if $(filter /%,$(firstword $(SUITE))),$(SUITE),$(CALLER)/$(SUITE))
+
 # Another suite has a build of its own: the tests look at the sample.
 RELEASE_BUILD := build/$(if $(SUITE),suite,windows)
 
 release: setup
 	@echo "== Building the programs of the release in $(RELEASE_BUILD)"
-	@cmake --preset windows -B $(RELEASE_BUILD) $(if $(SUITE),-D "HV_SUITE=$(SUITE)") >/dev/null
+	@cmake --preset windows -B $(RELEASE_BUILD) $(if $(SUITE),-D "HV_SUITE=$(SUITE_FOLDER)") >/dev/null
 	@cmake --build $(RELEASE_BUILD) --target hvinstaller hvdeploy
 	@scripts/make-release dist $(RELEASE_BUILD)
 

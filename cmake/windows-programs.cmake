@@ -28,6 +28,14 @@ function(hv_complete_windows_program program level code_page)
     hv_add_library_search(${program})
 endfunction()
 
+# hv_ships(PROGRAM): the linker leaves a map beside it (PROGRAM.exe.map), from which scripts/list-parts reads what went
+# into it.
+function(hv_ships program)
+    if(WIN32)
+        target_link_options(${program} PRIVATE LINKER:-Map,$<TARGET_FILE:${program}>.map)
+    endif()
+endfunction()
+
 # Narrow strings are UTF-8, paths may be long, Windows 10 is meant.
 function(hv_add_manifest program level code_page)
     set(HV_EXECUTION_LEVEL ${level})
