@@ -6,7 +6,6 @@
 #include <optional>
 #include <set>
 #include <string>
-#include <unordered_set>
 #include <vector>
 
 #include "hosts/HostAppCheck.h"
@@ -60,27 +59,27 @@ public:
     EngineResult EnsureDependencies();
 
     /// Whether the conditions of `payload` let it be placed: 0 passes it over, 1 and -1 (none held) place it.
-    int CheckPayloadPreconditions(const Payload& payload) const;
+    static int CheckPayloadPreconditions(const Payload& payload);
 
     /// Runs the script file and then the command of `script`. Gives 1 when one of them succeeded, 0 when there is
     /// neither or none succeeded and none had to, -2 as soon as one that has to succeed fails. Waits without a limit.
-    EngineResult RunPreOrPostflight(const PayloadScript& script, const Package& package);
+    static EngineResult RunPreOrPostflight(const PayloadScript& script, const Package& package);
 
     /// Writes one registry value. Gives 0 when it is written or not meant for this system, -1 when its key cannot be
     /// opened, else the registry's own code.
-    EngineResult MakeRegistryEntry(const RegistryEntry& entry);
+    static EngineResult MakeRegistryEntry(const RegistryEntry& entry);
 
     /// Makes a shortcut onto one of `placedFiles` and appends it to `installedFiles`. Gives 1, 0 when there is one of
     /// that name already, which is kept, or a failure.
-    EngineResult MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
-                              std::vector<std::string>& installedFiles);
+    static EngineResult MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
+                                     std::vector<std::string>& installedFiles);
 
     /// 0, or -1 when the package's own check fails.
-    int ValidatePackage(Package& package) const;
+    static EngineResult ValidatePackage(Package& package);
 
     /// Builds the suite's JSON text from the product data of the first package that names a suite. False when none
     /// does.
-    bool SynthesizeSuiteInfoFromProducts(const std::vector<fs::path>& packages, std::string& suiteText);
+    static bool SynthesizeSuiteInfoFromProducts(const std::vector<fs::path>& packages, std::string& suiteText);
 
     /// Raises the cancel switch, which is never lowered. Returns at once; the engine looks at it between payloads and
     /// between packages. Any thread may call this.
@@ -146,18 +145,12 @@ private:
     EngineResult RollBack(EngineResult result);
     void HandOverToUninstall(const Package& package, const std::vector<std::string>& installedFiles);
     bool WriteUninstallScript(const Package& package, const std::vector<std::string>& installedFiles);
-    bool DependenciesAreMet(const Package& package, const Payload& payload,
-                            const std::unordered_set<std::string>& known) const;
     bool IsCancelled();
-    int RegisterLegacyUninstall();
+    static int RegisterLegacyUninstall();
 
     // The payloads of a package, and what goes with each.
     EngineResult DeployPackagePayloads(const Package& package, std::vector<std::string>& installedFiles,
                                        float progressPoints, const std::string& message);
-    EngineResult RunScripts(const std::vector<PayloadScript>& scripts, const Package& package);
-    EngineResult FinishPayload(const Payload& payload, const Package& package, EngineResult result);
-    EngineResult MakeShortcuts(const Payload& payload, const std::vector<std::string>& placedFiles,
-                               std::vector<std::string>& installedFiles, EngineResult result);
 
     // Placement.
     EngineResult DeployPayload(const Payload& payload, const Package& package,

@@ -12,8 +12,6 @@
 namespace HV {
 namespace {
 
-constexpr const char* kOwner = "HV::Deploy::";
-
 // Fixed (contracts, packages folder): the name is reserved. The engine treats no package apart from the others by its
 // identifier, this one neither.
 [[maybe_unused]] constexpr const char* kRuntimePackage = "com.halvorn.vcredist-x64-2012";
@@ -68,7 +66,7 @@ void Deploy::SetVerbose(bool on) {
 }
 
 bool Deploy::LoadValidationInfo() {
-    TraceEntry(kOwner, "LoadValidationInfo");
+    TraceEntry(kDeployClass, "LoadValidationInfo");
     std::vector<std::string> names;
     GetValidationFileNames(names);
     for (const std::string& name : names) {
@@ -80,7 +78,7 @@ bool Deploy::LoadValidationInfo() {
 }
 
 EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std::vector<std::string>& packagesToSkip) {
-    TraceEntry(kOwner, "DeployPackagesFromDirectory");
+    TraceEntry(kDeployClass, "DeployPackagesFromDirectory");
     totalPackageBytes = 0;
     skipList = packagesToSkip;
     AddProgress(1.0F);
@@ -90,11 +88,11 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
     boost::system::error_code ignored;
     if (!fs::is_directory(dir, ignored)) {
         HVL_LOG(Error, "'" << dir << "' is not a directory.");
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     const FolderContent content = ScanFolder(dir);
     if (content.hasStranger) {
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     ReadSuiteInfo(content);
 
@@ -205,7 +203,7 @@ bool Deploy::IsSuite(const fs::path& suitePath) const {
 
 bool Deploy::SynthesizeSuiteInfoFromProducts(const std::vector<fs::path>& packages, std::string& suiteText) {
     // Fixed (contracts, run): the one entry line of this class that names the class once.
-    HVL_LOG(Debug, kOwner << "SynthesizeSuiteInfoFromProducts");
+    HVL_LOG(Debug, kDeployClass << "SynthesizeSuiteInfoFromProducts");
     for (const fs::path& path : packages) {
         try {
             Package package(path);
@@ -261,7 +259,7 @@ EngineResult Deploy::RunMainPhases(const FolderContent& content) {
 }
 
 EngineResult Deploy::DeployPackages(const std::vector<fs::path>& paths) {
-    TraceEntry(kOwner, "DeployPackages");
+    TraceEntry(kDeployClass, "DeployPackages");
     // Each phase starts with both empty, so a package can lean on packages of its own phase alone.
     installedIdentifiers.clear();
     deployedPackages.clear();

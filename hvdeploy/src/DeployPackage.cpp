@@ -13,8 +13,6 @@ namespace {
 
 using namespace HVL;
 
-constexpr const char* kOwner = "HV::Deploy::";
-
 // The products that bring their own way of removal.
 constexpr const char* kServiceProduct = "com.halvorn.service";
 constexpr const char* kManagerProduct = "com.halvorn.app";
@@ -46,10 +44,22 @@ bool HasUninstallScript(const Manifest& manifest) {
            });
 }
 
+// The first missing product speaks for its payload; the others are not looked at.
+bool DependenciesAreMet(const Package& package, const Payload& payload, const std::unordered_set<std::string>& known) {
+    for (const PayloadDependency& dependency : payload.dependencies) {
+        if (known.count(dependency.product) == 0) {
+            HVL_LOG(Error, "product " << package.manifest.GetProductData("display_name") << " requires package "
+                                      << dependency.product << ", not found or installed.");
+            return false;
+        }
+    }
+    return true;
+}
+
 }  // namespace
 
 EngineResult Deploy::DeployPackage(const fs::path& path) {
-    TraceEntry(kOwner, "DeployPackage");
+    TraceEntry(kDeployClass, "DeployPackage");
     HVL_LOG(Debug, "packagePath: " << path);
     deployedPackages.emplace_back(path);
     const float points = PackageProgressPoints(path);
@@ -62,16 +72,16 @@ EngineResult Deploy::DeployPackage(const fs::path& path) {
 }
 
 EngineResult Deploy::DeployPackage(Package& package, float progressPoints) {
-    TraceEntry(kOwner, "DeployPackage");
+    TraceEntry(kDeployClass, "DeployPackage");
     HVL_LOG(Debug, "package " << package.GetName() << ", progress points " << progressPoints);
     if (IsCancelled()) {
         HVL_LOG(Warn, "Installation cancelled, rolling back...");
         rollback.Rollback();
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     const std::string message = InstallMessage(package);
     HVL_LOG(Debug, message);
-    const int validation = ValidatePackage(package);
+    const EngineResult validation = ValidatePackage(package);
     if (progressPoints > 1.0F) {
         AddProgress(0.25F);
         progressPoints -= 0.25F;
@@ -88,7 +98,7 @@ EngineResult Deploy::InstallValidated(Package& package, float progressPoints, st
     const Manifest& manifest = package.manifest;
     if (fatalErrorTest) {
         HVL_LOG(Emerg, "creating a fatal error for testing purposes.");
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     if (!ShouldInstallPacakge(package)) {
         HVL_LOG(Debug, "Skipping package " << manifest.productId << " (v. " << manifest.productVersion << ")");
@@ -187,12 +197,12 @@ bool Deploy::WriteUninstallScript(const Package& package, const std::vector<std:
 
 // Fixed (contracts, removal script): the switch asks for this one line in the log.
 int Deploy::RegisterLegacyUninstall() {
-    TraceEntry(kOwner, "RegisterLegacyUninstall");
+    TraceEntry(kDeployClass, "RegisterLegacyUninstall");
     return 0;
 }
 
-int Deploy::ValidatePackage(Package& package) const {
-    TraceEntry(kOwner, "ValidatePackage");
+EngineResult Deploy::ValidatePackage(Package& package) {
+    TraceEntry(kDeployClass, "ValidatePackage");
     if (!package.Validate(false)) {
         HVL_LOG(Error, "package.Validate() failed for " << package.GetName());
         return kFailed;
@@ -202,7 +212,7 @@ int Deploy::ValidatePackage(Package& package) const {
 
 // Only a strictly newer installed version blocks a package: the same version is installed again.
 bool Deploy::ShouldInstallPacakge(const Package& package) {
-    TraceEntry(kOwner, "ShouldInstallPacakge");
+    TraceEntry(kDeployClass, "ShouldInstallPacakge");
     const Manifest& manifest = package.manifest;
     if (Holds(skipList, package.GetName()) || Holds(skipList, manifest.productId)) {
         return false;
@@ -214,7 +224,7 @@ bool Deploy::ShouldInstallPacakge(const Package& package) {
 }
 
 EngineResult Deploy::EnsureDependencies() {
-    TraceEntry(kOwner, "EnsureDependencies");
+    TraceEntry(kDeployClass, "EnsureDependencies");
     ReportProgress("Checking product dependencies...", 0);
     std::unordered_set<std::string> known(installedIdentifiers.begin(), installedIdentifiers.end());
     known.insert(history.Identifiers().begin(), history.Identifiers().end());
@@ -222,24 +232,11 @@ EngineResult Deploy::EnsureDependencies() {
     for (const Package& package : deployedPackages) {
         for (const Payload& payload : package.manifest.payloads) {
             if (payload.MatchesOS() && !DependenciesAreMet(package, payload, known)) {
-                result = kPlacementFailed;
+                result = kDeploymentFailed;
             }
         }
     }
     return result;
-}
-
-// The first missing product speaks for its payload; those behind it are not looked at.
-bool Deploy::DependenciesAreMet(const Package& package, const Payload& payload,
-                                const std::unordered_set<std::string>& known) const {
-    for (const PayloadDependency& dependency : payload.dependencies) {
-        if (known.count(dependency.product) == 0) {
-            HVL_LOG(Error, "product " << package.manifest.GetProductData("display_name") << " requires package "
-                                      << dependency.product << ", not found or installed.");
-            return false;
-        }
-    }
-    return true;
 }
 
 }  // namespace HV

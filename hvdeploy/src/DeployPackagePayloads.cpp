@@ -8,7 +8,6 @@
 namespace HV {
 namespace {
 
-constexpr const char* kOwner = "HV::Deploy::";
 constexpr int kNoDecision = -1;
 
 bool KeyExists(const std::string& target) {
@@ -62,11 +61,45 @@ private:
     float share;
 };
 
+// The code of the first script that fails, else 0.
+EngineResult RunScripts(const std::vector<PayloadScript>& scripts, const Package& package) {
+    for (const PayloadScript& script : scripts) {
+        if (const EngineResult result = Deploy::RunPreOrPostflight(script, package); IsFailure(result)) {
+            return result;
+        }
+    }
+    return kNothingDone;
+}
+
+// The registry entries of a placed payload and then its postflights; gives `result`, or the code of the first failure.
+EngineResult FinishPayload(const Payload& payload, const Package& package, EngineResult result) {
+    for (const RegistryEntry& entry : payload.registryEntries) {
+        if (const EngineResult written = Deploy::MakeRegistryEntry(entry); IsFailure(written)) {
+            return written;
+        }
+    }
+    const EngineResult scripts = RunScripts(payload.postflights, package);
+    return IsFailure(scripts) ? scripts : result;
+}
+
+// A shortcut that has to succeed and does not ends this loop, but not the walk: the next payload that is placed may put
+// its own result in the place of the failure.
+EngineResult MakeShortcuts(const Payload& payload, const std::vector<std::string>& placedFiles,
+                           std::vector<std::string>& installedFiles, EngineResult result) {
+    for (const Shortcut& shortcut : payload.shortcuts) {
+        const EngineResult made = Deploy::MakeShortcut(shortcut, placedFiles, installedFiles);
+        if (IsFailure(made) && shortcut.failOnError) {
+            return made;
+        }
+    }
+    return result;
+}
+
 }  // namespace
 
 EngineResult Deploy::DeployPackagePayloads(const Package& package, std::vector<std::string>& installedFiles,
                                            float progressPoints, const std::string& message) {
-    TraceEntry(kOwner, "DeployPackagePayloads");
+    TraceEntry(kDeployClass, "DeployPackagePayloads");
     PackagePoints points(*this, progressPoints, CountForThisSystem(package.manifest.payloads));
     EngineResult result = kNothingDone;
     for (const Payload& payload : package.manifest.payloads) {
@@ -95,7 +128,7 @@ EngineResult Deploy::DeployPackagePayloads(const Package& package, std::vector<s
         }
         if (IsCancelled()) {
             HVL_LOG(Info, "Installation cancelled");
-            return kPlacementFailed;
+            return kDeploymentFailed;
         }
         if (placement == kPlaced) {
             result = FinishPayload(payload, package, result);
@@ -110,42 +143,8 @@ EngineResult Deploy::DeployPackagePayloads(const Package& package, std::vector<s
     return result;
 }
 
-// The code of the first script that fails, else 0.
-EngineResult Deploy::RunScripts(const std::vector<PayloadScript>& scripts, const Package& package) {
-    for (const PayloadScript& script : scripts) {
-        if (const EngineResult result = RunPreOrPostflight(script, package); IsFailure(result)) {
-            return result;
-        }
-    }
-    return kNothingDone;
-}
-
-// The registry entries of a placed payload and then its postflights; gives `result`, or the code of the first failure.
-EngineResult Deploy::FinishPayload(const Payload& payload, const Package& package, EngineResult result) {
-    for (const RegistryEntry& entry : payload.registryEntries) {
-        if (const EngineResult written = MakeRegistryEntry(entry); IsFailure(written)) {
-            return written;
-        }
-    }
-    const EngineResult scripts = RunScripts(payload.postflights, package);
-    return IsFailure(scripts) ? scripts : result;
-}
-
-// A shortcut that has to succeed and does not ends this loop, but not the walk: the next payload that is placed may put
-// its own result in the place of the failure.
-EngineResult Deploy::MakeShortcuts(const Payload& payload, const std::vector<std::string>& placedFiles,
-                                   std::vector<std::string>& installedFiles, EngineResult result) {
-    for (const Shortcut& shortcut : payload.shortcuts) {
-        const EngineResult made = MakeShortcut(shortcut, placedFiles, installedFiles);
-        if (IsFailure(made) && shortcut.failOnError) {
-            return made;
-        }
-    }
-    return result;
-}
-
-int Deploy::CheckPayloadPreconditions(const Payload& payload) const {
-    TraceEntry(kOwner, "CheckPayloadPreconditions");
+int Deploy::CheckPayloadPreconditions(const Payload& payload) {
+    TraceEntry(kDeployClass, "CheckPayloadPreconditions");
     int decision = kNoDecision;
     for (const Precondition& condition : payload.preconditions) {
         if (Holds(condition)) {

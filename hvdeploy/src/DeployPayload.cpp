@@ -15,8 +15,6 @@ namespace {
 
 using namespace HVL;
 
-constexpr const char* kOwner = "HV::Deploy::";
-
 bool IsHostPayload(const Payload& payload) {
     return payload.type == PayloadType::Plugin || payload.deployment == DeploymentType::HostPlugins ||
            payload.deployment == DeploymentType::HostPresets || payload.deployment == DeploymentType::HostScripts;
@@ -66,7 +64,7 @@ void Append(std::vector<std::string>& list, const std::vector<std::string>& more
 
 EngineResult Deploy::DeployPayload(const Payload& payload, const Package& package,
                                    std::vector<std::string>& installedFiles) {
-    TraceEntry(kOwner, "DeployPayload");
+    TraceEntry(kDeployClass, "DeployPayload");
     HVL_LOG(Debug, "HV::Deploy::DeployPayload " << payload.id << " fromPackage " << package.GetName());
     if (verbose) {
         std::cout << "[v] Deploying payload " << payload.id << std::endl;
@@ -100,7 +98,7 @@ bool Deploy::RequiredHostIsPresent(const Payload& payload) {
 
 EngineResult Deploy::DeployAppPayload(const Payload& payload, const Package& package,
                                       std::vector<std::string>& installedFiles) {
-    TraceEntry(kOwner, "DeployAppPayload");
+    TraceEntry(kDeployClass, "DeployAppPayload");
     if (!RequiredHostIsPresent(payload)) {
         return kNothingDone;
     }
@@ -112,13 +110,13 @@ EngineResult Deploy::DeployAppPayload(const Payload& payload, const Package& pac
         const SysDir directory = SysDirFromKeyword(payload.sysdir);
         if (directory == SysDir::Unknown) {
             HVL_LOG(Error, "UNSUPPORTED payload sysdir value: " << payload.sysdir);
-            return kPlacementFailed;
+            return kDeploymentFailed;
         }
         destination = GetSystemDirectory(directory);
     }
     if (destination.empty()) {
         HVL_LOG(Error, "no install path found for app payload: " << payload.id);
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     std::vector<std::string> items;
     const EngineResult result = DeployPayloadToDirectory(payload, package, destination, items);
@@ -128,26 +126,26 @@ EngineResult Deploy::DeployAppPayload(const Payload& payload, const Package& pac
 
 EngineResult Deploy::DeploySysDirPayload(const Payload& payload, const Package& package,
                                          std::vector<std::string>& installedFiles) {
-    TraceEntry(kOwner, "DeploySysDirPayload");
+    TraceEntry(kDeployClass, "DeploySysDirPayload");
     if (!RequiredHostIsPresent(payload)) {
         return kNothingDone;
     }
     const SysDir directory = SysDirFromKeyword(payload.sysdir);
     if (!IsTargetDirectory(directory)) {
         HVL_LOG(Error, "UNSUPPORTED payload sysdir value: " << payload.sysdir);
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     const fs::path destination = GetSystemDirectory(directory);
     if (destination.empty() && directory != SysDir::AbsolutePath) {
         HVL_LOG(Error, "no path found for target sysdir value: " << payload.sysdir);
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     return DeployPayloadToDirectory(payload, package, destination, installedFiles);
 }
 
 EngineResult Deploy::DeployHostPayload(const Payload& payload, const Package& package,
                                        std::vector<std::string>& installedFiles) {
-    TraceEntry(kOwner, "DeployHostPayload");
+    TraceEntry(kDeployClass, "DeployHostPayload");
     if (!hostCheck.DetectHosts()) {
         HVL_LOG(Debug, "No hosts detected on machine, skipping payload " << payload.id);
         return kNothingDone;
@@ -184,7 +182,7 @@ EngineResult Deploy::DeployHostPayload(const Payload& payload, const Package& pa
 // Fixed (contracts, placement): an exception leaves the result as it stood, unlike a copy that reports its failure.
 EngineResult Deploy::DeployPayloadToDirectory(Payload payload, const Package& package, const fs::path& destDir,
                                               std::vector<std::string>& installedFiles) {
-    TraceEntry(kOwner, "DeployPayloadToDirectory");
+    TraceEntry(kDeployClass, "DeployPayloadToDirectory");
     EngineResult result = kNothingDone;
     try {
         CopyPayloadItems(payload, package, destDir, installedFiles, result);
@@ -211,7 +209,7 @@ void Deploy::CopyPayloadItems(const Payload& payload, const Package& package, co
         // What is missing is made below a folder that is held, and is then itself held.
         if (!target.HoldNearest(parent) || !EnsureParent(parent) || !target.HoldNearest(parent) ||
             !CopyPayloadItem(item)) {
-            result = kPlacementFailed;
+            result = kDeploymentFailed;
             return;
         }
         installedFiles.push_back(item.destination.string());

@@ -49,7 +49,7 @@ void Deploy::ReportProgress(const char* message, std::int32_t error) {
 }
 
 void Deploy::Cancel() {
-    TraceEntry("HV::Deploy::", "Cancel");
+    TraceEntry(kDeployClass, "Cancel");
     const boost::mutex::scoped_lock guard(cancelMutex);
     cancelled = true;
 }

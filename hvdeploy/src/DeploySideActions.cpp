@@ -17,7 +17,6 @@ namespace {
 
 using namespace HVL;
 
-constexpr const char* kOwner = "HV::Deploy::";
 constexpr unsigned kBroadcastTimeoutMilliseconds = 1000;
 
 // Whether `line` begins with a path in quotes. A quoted word without a separator is a command like any other, and a
@@ -105,7 +104,7 @@ EngineResult RunLine(const std::string& line, const PayloadScript& script, const
     }
     if (script.failOnError) {
         HVL_LOG(Error, kind.noun << " returned " << code);
-        return kPlacementFailed;
+        return kDeploymentFailed;
     }
     HVL_LOG(Warn, script.id << " execution returned " << code << ". Continuing");
     return result;
@@ -120,7 +119,7 @@ void AnnounceEnvironmentChange() {
 }  // namespace
 
 EngineResult Deploy::RunPreOrPostflight(const PayloadScript& script, const Package& package) {
-    TraceEntry(kOwner, "RunPreOrPostflight");
+    TraceEntry(kDeployClass, "RunPreOrPostflight");
     EngineResult result = kNothingDone;
     if (!script.source.empty()) {
         HVL_LOG(Debug, "Running payload script: [id: " << script.id << "]");
@@ -138,7 +137,7 @@ EngineResult Deploy::RunPreOrPostflight(const PayloadScript& script, const Packa
 }
 
 EngineResult Deploy::MakeRegistryEntry(const RegistryEntry& entry) {
-    TraceEntry(kOwner, "MakeRegistryEntry");
+    TraceEntry(kDeployClass, "MakeRegistryEntry");
     if (entry.os != "windows") {
         return kNothingDone;
     }
@@ -161,7 +160,7 @@ EngineResult Deploy::MakeRegistryEntry(const RegistryEntry& entry) {
 
 EngineResult Deploy::MakeShortcut(const Shortcut& shortcut, const std::vector<std::string>& placedFiles,
                                   std::vector<std::string>& installedFiles) {
-    TraceEntry(kOwner, "MakeShortcut");
+    TraceEntry(kDeployClass, "MakeShortcut");
     const SysDir directory = SysDirFromKeyword(shortcut.sysdir);
     if (!IsTargetDirectory(directory)) {
         HVL_LOG(Error, "Invalid sysdir specified for shortcut.");

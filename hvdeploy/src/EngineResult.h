@@ -10,7 +10,9 @@ using EngineResult = std::int32_t;
 constexpr EngineResult kNothingDone = 0;
 constexpr EngineResult kPlaced = 1;
 constexpr EngineResult kFailed = -1;
-constexpr EngineResult kPlacementFailed = -2;
+/// What a deployment gives that ends early: a placement or a script failed, a dependency is missing, or somebody has
+/// cancelled it.
+constexpr EngineResult kDeploymentFailed = -2;
 
 /// Results are tested as unsigned numbers, so every negative one is a failure too.
 constexpr bool IsFailure(EngineResult result) {

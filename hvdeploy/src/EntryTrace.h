@@ -4,7 +4,11 @@
 
 namespace HV {
 
-/// The line that an operation writes at DEBUG when it is entered. `owner` is its class with "::" behind it.
+/// The two classes whose operations write entry lines, as these lines spell them.
+inline constexpr const char* kDeployClass = "HV::Deploy::";
+inline constexpr const char* kDeployCLIClass = "HV::DeployCLI::";
+
+/// The line that an operation writes at DEBUG when it is entered. `owner` is its class, with the "::" that follows.
 ///
 /// Fixed (contracts, run): the class stands twice in the line ("HV::Deploy::HV::Deploy::DeployPackage").
 inline void TraceEntry(const char* owner, const char* operation) {

@@ -17,7 +17,6 @@
 namespace HV {
 namespace {
 
-constexpr const char* kOwner = "HV::DeployCLI::";
 constexpr const char* kProgramArgument = "./hvdeploy";
 constexpr const char* kProductVersion = "2.0-d1";
 
@@ -186,7 +185,7 @@ int DeployCLI::Run() {
 }
 
 int DeployCLI::RunCommand() {
-    HVL_LOG(Info, kOwner << "HV::DeployCLI::Run");
+    HVL_LOG(Info, kDeployCLIClass << "HV::DeployCLI::Run");
     verbose = HasFlag(kVerbose);
     PrintBanner();
     // Fixed (contracts, run): the flags that print something do not end the run. A line that holds only "--version"
@@ -226,7 +225,7 @@ int ErrorCodeFromText(const std::string& text) {
 }
 
 int DeployCLI::DoDeployCommand() {
-    TraceEntry(kOwner, "DoDeployCommand");
+    TraceEntry(kDeployCLIClass, "DoDeployCommand");
     const bool hasFile = CountArg(kFile);
     const fs::path file(hasFile ? GetArg(kFile) : "");
     // With "file=" on the line "dir=" is not read, even when the file's name is empty.

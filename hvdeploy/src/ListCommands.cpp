@@ -9,14 +9,9 @@
 #include "hvframework/Log.h"
 
 namespace HV {
-namespace {
-
-constexpr const char* kOwner = "HV::DeployCLI::";
-
-}  // namespace
 
 int DeployCLI::DoListCommand() {
-    TraceEntry(kOwner, "DoListCommand");
+    TraceEntry(kDeployCLIClass, "DoListCommand");
     const std::string wanted = GetArg("list=");
     if (wanted == "hosts") {
         return ListHosts();
@@ -34,7 +29,7 @@ int DeployCLI::DoListCommand() {
 }
 
 int DeployCLI::ListHosts() {
-    TraceEntry(kOwner, "ListHosts");
+    TraceEntry(kDeployCLIClass, "ListHosts");
     HostAppCheck check;
     if (!check.DetectHosts()) {
         std::cout << "[]" << std::endl;
@@ -51,7 +46,7 @@ int DeployCLI::ListHosts() {
 }
 
 int DeployCLI::ListInstalled() {
-    TraceEntry(kOwner, "ListInstalled");
+    TraceEntry(kDeployCLIClass, "ListInstalled");
     std::vector<std::string> stems = ReadHistoryStems(kHistoryFolder);
     std::sort(stems.begin(), stems.end());
     for (const std::string& stem : stems) {
@@ -62,14 +57,14 @@ int DeployCLI::ListInstalled() {
 }
 
 int DeployCLI::ListPackages() {
-    TraceEntry(kOwner, "ListPackages");
+    TraceEntry(kDeployCLIClass, "ListPackages");
     HVL_LOG(Warn, "ListPackages not yet implemented.");
     return 0;
 }
 
 // Fixed (contracts, run): the text is that of the packages.
 int DeployCLI::ListCommands() {
-    TraceEntry(kOwner, "ListCommands");
+    TraceEntry(kDeployCLIClass, "ListCommands");
     HVL_LOG(Warn, "ListPackages not yet implemented.");
     return 0;
 }
