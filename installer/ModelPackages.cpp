@@ -98,13 +98,8 @@ std::string PropertyOr(const Manifest& manifest, const std::string& key, const s
     return found == manifest.productData.end() ? otherwise : found->second;
 }
 
-bool GoesIntoHosts(const Payload& payload) {
-    return payload.deployment == DeploymentType::HostPlugins || payload.deployment == DeploymentType::HostPresets ||
-           payload.deployment == DeploymentType::HostScripts;
-}
-
 bool NeedsNoHost(const Payload& payload) {
-    return payload.type != PayloadType::Plugin && !GoesIntoHosts(payload) && payload.hosts.empty();
+    return !payload.GoesIntoHosts() && payload.hosts.empty();
 }
 
 // One host is enough to make the payload worth installing. The others are not looked at, so of several hosts of one

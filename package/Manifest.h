@@ -116,6 +116,9 @@ struct Payload {
     [[nodiscard]] bool MatchesOS() const;
 
     [[nodiscard]] bool HasWildcardSource() const;
+
+    /// Whether the payload is placed into the folders of hosts: a plug-in, or what is deployed as a host's own.
+    [[nodiscard]] bool GoesIntoHosts() const;
 };
 
 struct InstallerPolicy {

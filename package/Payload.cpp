@@ -301,4 +301,9 @@ bool Payload::HasWildcardSource() const {
     return source.find('*') != std::string::npos;
 }
 
+bool Payload::GoesIntoHosts() const {
+    return type == PayloadType::Plugin || deployment == DeploymentType::HostPlugins ||
+           deployment == DeploymentType::HostPresets || deployment == DeploymentType::HostScripts;
+}
+
 }  // namespace HV
