@@ -12,7 +12,8 @@
 #include "hvdeploy/src/DeployRollback.h"
 #include "hvdeploy/src/EngineResult.h"
 #include "hvdeploy/src/InstalledHistory.h"
-#include "hvdeploy/src/ProgressListener.h"
+#include "hvdeploy/src/Placement.h"
+#include "hvdeploy/src/RunProgress.h"
 #include "hvdeploy/src/UninstallScripts.h"
 #include "hvframework/ProductData.h"
 #include "hvframework/TempFolder.h"
@@ -86,13 +87,13 @@ public:
     void Cancel();
 
     /// Adds to the percentage, which this way never passes 97.
-    void AddProgress(float points);
+    void AddProgress(float points) { progress.Add(points); }
 
     /// Tells the listener and the log how far the run has come. `message` may be null.
-    void ReportProgress(const char* message, std::int32_t error);
+    void ReportProgress(const char* message, std::int32_t error) { progress.Report(message, error); }
 
     /// The share of one package in the 90 points that packages have, by the size of its file.
-    float PackageProgressPoints(const fs::path& path) const;
+    float PackageProgressPoints(const fs::path& path) const { return progress.PointsOf(path); }
 
     /// Lets a folder be installed from only when all that is read of it are files of these names. Another one fails the
     /// run before anything is done.
@@ -101,7 +102,7 @@ public:
     void SetVerbose(bool on);
     void SetLegacyUninstall(bool on) { legacyUninstall = on; }
     void SetFatalErrorTest(bool on) { fatalErrorTest = on; }
-    void SetListener(ProgressListenerInterface* newListener) { listener = newListener; }
+    void SetListener(ProgressListenerInterface* listener) { progress.SetListener(listener); }
 
     /// The hosts that payloads are placed for. Detectors can be added until the first payload is placed.
     HostAppCheck& HostCheck() { return hostCheck; }
@@ -113,6 +114,7 @@ public:
 private:
     /// What a walk over a packages folder finds.
     struct FolderContent {
+        std::uint64_t packageBytes = 0;
         std::vector<fs::path> preflightPackages;
         std::vector<fs::path> mainPackages;
         std::vector<fs::path> postflightPackages;
@@ -132,7 +134,6 @@ private:
     bool IsSuite(const fs::path& suitePath) const;
     EngineResult RunPreflightPhase(const std::vector<fs::path>& packages);
     EngineResult RunMainPhases(const FolderContent& content);
-    void SetProgress(float percent, const char* message);
     EngineResult DeployEach(const std::vector<fs::path>& paths);
     bool LoadValidationInfo();
 
@@ -148,25 +149,9 @@ private:
     bool IsCancelled();
     static int RegisterLegacyUninstall();
 
-    // The payloads of a package, and what goes with each.
-    EngineResult DeployPackagePayloads(const Package& package, std::vector<std::string>& installedFiles,
-                                       float progressPoints, const std::string& message);
-
-    // Placement.
-    EngineResult DeployPayload(const Payload& payload, const Package& package,
-                               std::vector<std::string>& installedFiles);
-    EngineResult DeployAppPayload(const Payload& payload, const Package& package,
-                                  std::vector<std::string>& installedFiles);
-    EngineResult DeployHostPayload(const Payload& payload, const Package& package,
-                                   std::vector<std::string>& installedFiles);
-    EngineResult DeploySysDirPayload(const Payload& payload, const Package& package,
-                                     std::vector<std::string>& installedFiles);
-    EngineResult DeployPayloadToDirectory(Payload payload, const Package& package, const fs::path& destDir,
-                                          std::vector<std::string>& installedFiles);
-    void CopyPayloadItems(const Payload& payload, const Package& package, const fs::path& destDir,
-                          std::vector<std::string>& installedFiles, EngineResult& result);
-    bool CopyPayloadItem(const PayloadPathPair& item);
-    bool RequiredHostIsPresent(const Payload& payload);
+    // The payloads of a package.
+    Placed DeployPackagePayloads(const Package& package, float progressPoints, const std::string& message);
+    Placed DeployPayload(const Payload& payload, const Package& package);
 
     std::uint32_t lastError = 0;  // stays 0: the report "An error has occured" carries no number of its own
     DeployRollback rollback;
@@ -187,9 +172,7 @@ private:
     std::vector<std::string> skipList;
     std::optional<std::set<std::string>> acceptedNames;  // all are, unless somebody has said which
     std::map<std::string, ValidationInfo> validationInfo;
-    std::uint64_t totalPackageBytes = 0;
-    ProgressListenerInterface* listener;
-    float progress = 0.0F;
+    RunProgress progress;
 };
 
 }  // namespace HV

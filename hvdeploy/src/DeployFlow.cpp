@@ -52,7 +52,7 @@ std::string SuiteText(const std::string& identifier, const std::string& version,
 
 }  // namespace
 
-Deploy::Deploy(ProgressListenerInterface* progressListener) : history(kHistoryFolder), listener(progressListener) {
+Deploy::Deploy(ProgressListenerInterface* listener) : history(kHistoryFolder), progress(listener) {
     if (listener != nullptr) {
         AddProgress(1.0F);
         ReportProgress("Preparing to install...", 0);
@@ -63,6 +63,17 @@ Deploy::Deploy(ProgressListenerInterface* progressListener) : history(kHistoryFo
 void Deploy::SetVerbose(bool on) {
     verbose = on;
     rollback.SetVerbose(on);
+}
+
+void Deploy::Cancel() {
+    TraceEntry(kDeployClass, "Cancel");
+    const boost::mutex::scoped_lock guard(cancelMutex);
+    cancelled = true;
+}
+
+bool Deploy::IsCancelled() {
+    const boost::mutex::scoped_lock guard(cancelMutex);
+    return cancelled;
 }
 
 bool Deploy::LoadValidationInfo() {
@@ -79,7 +90,6 @@ bool Deploy::LoadValidationInfo() {
 
 EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std::vector<std::string>& packagesToSkip) {
     TraceEntry(kDeployClass, "DeployPackagesFromDirectory");
-    totalPackageBytes = 0;
     skipList = packagesToSkip;
     AddProgress(1.0F);
     ReportProgress("Checking packages to install...", 0);
@@ -94,6 +104,7 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
     if (content.hasStranger) {
         return kDeploymentFailed;
     }
+    progress.DivideAmong(content.packageBytes);
     ReadSuiteInfo(content);
 
     const EngineResult preflightResult = RunPreflightPhase(content.preflightPackages);
@@ -103,7 +114,7 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
     }
     const EngineResult result = RunMainPhases(content);
     // Fixed (contracts, packages folder): a failed run reports this too. Its result tells the listener.
-    SetProgress(100.0F, "Installation complete.");
+    progress.SetTo(100.0F, "Installation complete.");
     if (!IsFailure(result)) {
         // The run has succeeded by now, and what becomes of the entry does not change that.
         OSRegisterUninstall(uninstallPath, suiteInfo);
@@ -146,7 +157,7 @@ bool Deploy::IsAccepted(const fs::path& file) const {
 // Packages to skip are listed and counted like all others and fall out later, so the percentages do not depend on them.
 // None is added to the packages that a suite could be synthesised from: a folder without a suite file has no suite.
 void Deploy::AddPackageFile(const fs::path& path, FolderContent& content) {
-    totalPackageBytes += fs::file_size(path);
+    content.packageBytes += fs::file_size(path);
     const std::string name = ToLower(path.filename().string());
     if (HVL::StringUtils::StartsWith(name, kPreflightPrefix)) {
         content.preflightPackages.push_back(path);
@@ -248,7 +259,7 @@ EngineResult Deploy::RunMainPhases(const FolderContent& content) {
     if (IsFailure(result)) {
         HVL_LOG(Error, "Main package install returned " << result);
     }
-    SetProgress(98.0F, "Completing installation.");
+    progress.SetTo(98.0F, "Completing installation.");
     if (!IsFailure(result)) {
         result = DeployPackages(content.postflightPackages);
         if (IsFailure(result)) {

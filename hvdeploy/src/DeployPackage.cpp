@@ -139,21 +139,20 @@ bool Deploy::Extract(Package& package) {
 }
 
 EngineResult Deploy::PlacePackage(Package& package, float progressPoints, const std::string& message) {
-    std::vector<std::string> installedFiles;
-    EngineResult result = kNothingDone;
+    Placed placed;
     try {
-        result = DeployPackagePayloads(package, installedFiles, progressPoints, message);
+        placed = DeployPackagePayloads(package, progressPoints, message);
     } catch (...) {
         // What a detector or the filesystem library throws ends the run; the temporary files must not outlive it.
         RemoveTempFiles(package);
         throw;
     }
-    if (result == kPlaced) {
+    if (placed.result == kPlaced) {
         HVL_LOG(Debug, " - DeployPackagePayloads success for " << package.manifest.productId);
-        HandOverToUninstall(package, installedFiles);
+        HandOverToUninstall(package, placed.files);
     }
     RemoveTempFiles(package);
-    return result;
+    return placed.result;
 }
 
 void Deploy::RemoveTempFiles(const Package& package) {

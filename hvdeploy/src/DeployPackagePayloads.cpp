@@ -1,6 +1,9 @@
 // The walk over the payloads of one package: what is passed over, what is placed, and what goes with a placed payload.
+#include <iostream>
+
 #include "hvdeploy/src/Deploy.h"
 #include "hvdeploy/src/EntryTrace.h"
+#include "hvdeploy/src/Placement.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "system/RegistryKey.h"
@@ -33,33 +36,17 @@ std::size_t CountForThisSystem(const std::vector<Payload>& payloads) {
     return count;
 }
 
-/// The points of one package while its payloads spend them. Whatever is left goes to the bar in the end, on every way
-/// out.
-class PackagePoints {
-public:
-    PackagePoints(Deploy& engine, float points, std::size_t payloads)
-        : deploy(engine), remaining(points), share(payloads == 0 ? 0.0F : points / static_cast<float>(payloads)) {}
-    ~PackagePoints() {
-        if (remaining > 0.0F) {
-            deploy.AddProgress(remaining);
-        }
+bool IsPassedOver(const Payload& payload) {
+    if (!payload.MatchesOS()) {
+        HVL_LOG(Debug, "Skipping Payload (reason: non-supported OS): " << payload.id << " ");
+        return true;
     }
-    PackagePoints(const PackagePoints&) = delete;
-    PackagePoints& operator=(const PackagePoints&) = delete;
-
-    void SpendShare(const std::string& message) {
-        if (remaining > 0.0F && share > 0.0F) {
-            deploy.AddProgress(share);
-            remaining -= share;
-            deploy.ReportProgress(message.c_str(), 0);
-        }
+    if (!payload.preconditions.empty() && Deploy::CheckPayloadPreconditions(payload) == 0) {
+        HVL_LOG(Debug, "Precondition negative result: skipping payload " << payload.id);
+        return true;
     }
-
-private:
-    Deploy& deploy;
-    float remaining;
-    float share;
-};
+    return false;
+}
 
 // The code of the first script that fails, else 0.
 EngineResult RunScripts(const std::vector<PayloadScript>& scripts, const Package& package) {
@@ -82,65 +69,68 @@ EngineResult FinishPayload(const Payload& payload, const Package& package, Engin
     return IsFailure(scripts) ? scripts : result;
 }
 
-// A shortcut that has to succeed and does not ends this loop, but not the walk: the next payload that is placed may put
-// its own result in the place of the failure.
-EngineResult MakeShortcuts(const Payload& payload, const std::vector<std::string>& placedFiles,
-                           std::vector<std::string>& installedFiles, EngineResult result) {
+// Adds the shortcuts of a placed payload to the files of `all`, and gives its result, or the code of the first one that
+// has to succeed and does not. Such a one ends this loop, but not the walk: the next payload that is placed may put its
+// own result in the place of the failure.
+EngineResult MakeShortcuts(const Payload& payload, const std::vector<std::string>& placedFiles, Placed& all) {
     for (const Shortcut& shortcut : payload.shortcuts) {
-        const EngineResult made = Deploy::MakeShortcut(shortcut, placedFiles, installedFiles);
+        const EngineResult made = Deploy::MakeShortcut(shortcut, placedFiles, all.files);
         if (IsFailure(made) && shortcut.failOnError) {
             return made;
         }
     }
-    return result;
+    return all.result;
 }
 
 }  // namespace
 
-EngineResult Deploy::DeployPackagePayloads(const Package& package, std::vector<std::string>& installedFiles,
-                                           float progressPoints, const std::string& message) {
+Placed Deploy::DeployPackagePayloads(const Package& package, float progressPoints, const std::string& message) {
     TraceEntry(kDeployClass, "DeployPackagePayloads");
-    PackagePoints points(*this, progressPoints, CountForThisSystem(package.manifest.payloads));
-    EngineResult result = kNothingDone;
+    PackagePoints points(progress, progressPoints, CountForThisSystem(package.manifest.payloads));
+    Placed all;
     for (const Payload& payload : package.manifest.payloads) {
-        if (!payload.MatchesOS()) {
-            HVL_LOG(Debug, "Skipping Payload (reason: non-supported OS): " << payload.id << " ");
-            continue;
-        }
-        if (!payload.preconditions.empty() && CheckPayloadPreconditions(payload) == 0) {
-            HVL_LOG(Debug, "Precondition negative result: skipping payload " << payload.id);
+        if (IsPassedOver(payload)) {
             continue;
         }
         // A failing preflight does not keep the payload from being placed, and a placement that succeeds takes the
         // place of the script's code: only a payload that placed nothing shows it.
         if (const EngineResult scripts = RunScripts(payload.preflights, package); IsFailure(scripts)) {
-            result = scripts;
+            all.result = scripts;
         }
-        std::vector<std::string> placedFiles;
-        const EngineResult placement = DeployPayload(payload, package, placedFiles);
-        installedFiles.insert(installedFiles.end(), placedFiles.begin(), placedFiles.end());
+        const Placed placed = DeployPayload(payload, package);
+        all.files.insert(all.files.end(), placed.files.begin(), placed.files.end());
         points.SpendShare(message);
-        if (IsFailure(placement)) {
-            return placement;
+        if (placed.result != kNothingDone) {
+            all.result = placed.result;
         }
-        if (placement == kPlaced) {
-            result = kPlaced;
+        if (IsFailure(placed.result)) {
+            break;
         }
         if (IsCancelled()) {
             HVL_LOG(Info, "Installation cancelled");
-            return kDeploymentFailed;
-        }
-        if (placement == kPlaced) {
-            result = FinishPayload(payload, package, result);
-        }
-        if (IsFailure(result)) {
+            all.result = kDeploymentFailed;
             break;
         }
-        if (placement == kPlaced) {
-            result = MakeShortcuts(payload, placedFiles, installedFiles, result);
+        if (placed.result == kPlaced) {
+            all.result = FinishPayload(payload, package, all.result);
+        }
+        if (IsFailure(all.result)) {
+            break;
+        }
+        if (placed.result == kPlaced) {
+            all.result = MakeShortcuts(payload, placed.files, all);
         }
     }
-    return result;
+    return all;
+}
+
+Placed Deploy::DeployPayload(const Payload& payload, const Package& package) {
+    TraceEntry(kDeployClass, "DeployPayload");
+    HVL_LOG(Debug, "HV::Deploy::DeployPayload " << payload.id << " fromPackage " << package.GetName());
+    if (verbose) {
+        std::cout << "[v] Deploying payload " << payload.id << std::endl;
+    }
+    return Placement(hostCheck, rollback).Place(payload, package);
 }
 
 int Deploy::CheckPayloadPreconditions(const Payload& payload) {

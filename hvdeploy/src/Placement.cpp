@@ -1,8 +1,8 @@
-// One payload: into which folders its files go, and the copying itself.
-#include <algorithm>
-#include <iostream>
+// One payload, from its manifest to its last file. The engine's entry lines name the engine here too.
+#include "hvdeploy/src/Placement.h"
 
-#include "hvdeploy/src/Deploy.h"
+#include <algorithm>
+
 #include "hvdeploy/src/EntryTrace.h"
 #include "hvdeploy/src/HeldTarget.h"
 #include "hvdeploy/src/TargetDirectories.h"
@@ -15,9 +15,8 @@ namespace {
 
 using namespace HVL;
 
-bool IsHostPayload(const Payload& payload) {
-    return payload.type == PayloadType::Plugin || payload.deployment == DeploymentType::HostPlugins ||
-           payload.deployment == DeploymentType::HostPresets || payload.deployment == DeploymentType::HostScripts;
+Placed Failed() {
+    return {kDeploymentFailed, {}};
 }
 
 // These two references say that the payload belongs where After Effects and Premiere of one generation both read.
@@ -56,51 +55,34 @@ bool EnsureParent(const fs::path& path) {
     return true;
 }
 
+bool Holds(const std::vector<std::string>& list, const std::string& text) {
+    return std::find(list.begin(), list.end(), text) != list.end();
+}
+
 void Append(std::vector<std::string>& list, const std::vector<std::string>& more) {
     list.insert(list.end(), more.begin(), more.end());
 }
 
 }  // namespace
 
-EngineResult Deploy::DeployPayload(const Payload& payload, const Package& package,
-                                   std::vector<std::string>& installedFiles) {
-    TraceEntry(kDeployClass, "DeployPayload");
-    HVL_LOG(Debug, "HV::Deploy::DeployPayload " << payload.id << " fromPackage " << package.GetName());
-    if (verbose) {
-        std::cout << "[v] Deploying payload " << payload.id << std::endl;
-    }
+Placed Placement::Place(const Payload& payload, const Package& package) {
     if (payload.type == PayloadType::App || payload.deployment == DeploymentType::App) {
-        return DeployAppPayload(payload, package, installedFiles);
+        return DeployAppPayload(payload, package);
     }
-    if (IsHostPayload(payload)) {
-        return DeployHostPayload(payload, package, installedFiles);
+    if (payload.GoesIntoHosts()) {
+        return DeployHostPayload(payload, package);
     }
     if (payload.deployment == DeploymentType::SysDir && !payload.sysdir.empty()) {
-        return DeploySysDirPayload(payload, package, installedFiles);
+        return DeploySysDirPayload(payload, package);
     }
     // "run" among them: such a payload is there for its scripts.
-    return kNothingDone;
+    return {};
 }
 
-// For these payloads hosts are a requirement and not targets: one of them has to be on the machine.
-bool Deploy::RequiredHostIsPresent(const Payload& payload) {
-    if (payload.hosts.empty()) {
-        return true;
-    }
-    const bool present =
-        hostCheck.DetectHosts() && std::any_of(payload.hosts.begin(), payload.hosts.end(),
-                                               [&](const std::string& ref) { return hostCheck.HasHost(ref); });
-    if (!present) {
-        HVL_LOG(Warn, "Required host application(s) not found for payload " << payload.id << ", skipping...");
-    }
-    return present;
-}
-
-EngineResult Deploy::DeployAppPayload(const Payload& payload, const Package& package,
-                                      std::vector<std::string>& installedFiles) {
+Placed Placement::DeployAppPayload(const Payload& payload, const Package& package) {
     TraceEntry(kDeployClass, "DeployAppPayload");
     if (!RequiredHostIsPresent(payload)) {
-        return kNothingDone;
+        return {};
     }
     HVL_LOG(Info, "Deploying application " << payload.id);
     fs::path destination;
@@ -110,92 +92,101 @@ EngineResult Deploy::DeployAppPayload(const Payload& payload, const Package& pac
         const SysDir directory = SysDirFromKeyword(payload.sysdir);
         if (directory == SysDir::Unknown) {
             HVL_LOG(Error, "UNSUPPORTED payload sysdir value: " << payload.sysdir);
-            return kDeploymentFailed;
+            return Failed();
         }
         destination = GetSystemDirectory(directory);
     }
     if (destination.empty()) {
         HVL_LOG(Error, "no install path found for app payload: " << payload.id);
-        return kDeploymentFailed;
+        return Failed();
     }
-    std::vector<std::string> items;
-    const EngineResult result = DeployPayloadToDirectory(payload, package, destination, items);
-    Append(installedFiles, items);
-    return result;
+    return DeployPayloadToDirectory(payload, package, destination);
 }
 
-EngineResult Deploy::DeploySysDirPayload(const Payload& payload, const Package& package,
-                                         std::vector<std::string>& installedFiles) {
+Placed Placement::DeploySysDirPayload(const Payload& payload, const Package& package) {
     TraceEntry(kDeployClass, "DeploySysDirPayload");
     if (!RequiredHostIsPresent(payload)) {
-        return kNothingDone;
+        return {};
     }
     const SysDir directory = SysDirFromKeyword(payload.sysdir);
     if (!IsTargetDirectory(directory)) {
         HVL_LOG(Error, "UNSUPPORTED payload sysdir value: " << payload.sysdir);
-        return kDeploymentFailed;
+        return Failed();
     }
     const fs::path destination = GetSystemDirectory(directory);
     if (destination.empty() && directory != SysDir::AbsolutePath) {
         HVL_LOG(Error, "no path found for target sysdir value: " << payload.sysdir);
-        return kDeploymentFailed;
+        return Failed();
     }
-    return DeployPayloadToDirectory(payload, package, destination, installedFiles);
+    return DeployPayloadToDirectory(payload, package, destination);
 }
 
-EngineResult Deploy::DeployHostPayload(const Payload& payload, const Package& package,
-                                       std::vector<std::string>& installedFiles) {
-    TraceEntry(kDeployClass, "DeployHostPayload");
-    if (!hostCheck.DetectHosts()) {
-        HVL_LOG(Debug, "No hosts detected on machine, skipping payload " << payload.id);
-        return kNothingDone;
+// For these payloads hosts are a requirement and not targets: one of them has to be on the machine.
+bool Placement::RequiredHostIsPresent(const Payload& payload) {
+    if (payload.hosts.empty()) {
+        return true;
     }
+    const bool present =
+        hosts_.DetectHosts() && std::any_of(payload.hosts.begin(), payload.hosts.end(),
+                                            [&](const std::string& ref) { return hosts_.HasHost(ref); });
+    if (!present) {
+        HVL_LOG(Warn, "Required host application(s) not found for payload " << payload.id << ", skipping...");
+    }
+    return present;
+}
+
+Placed Placement::DeployHostPayload(const Payload& payload, const Package& package) {
+    TraceEntry(kDeployClass, "DeployHostPayload");
+    if (!hosts_.DetectHosts()) {
+        HVL_LOG(Debug, "No hosts detected on machine, skipping payload " << payload.id);
+        return {};
+    }
+    Placed all;
     std::vector<std::string> doneDirs;
-    EngineResult result = kNothingDone;
     for (const std::string& hostRef : payload.hosts) {
         std::vector<HostRecord> matches;
-        if (!hostCheck.FindHosts(hostRef, matches)) {
+        if (!hosts_.FindHosts(hostRef, matches)) {
             HVL_LOG(Debug, "No matching hosts found for payload " << payload.id << ", skipping...");
             continue;
         }
         for (const HostRecord& host : matches) {
             const std::string target = TargetFolder(host, hostRef, payload.deployment);
             // Several versions, and both hosts of a pair, point to one shared folder: it gets the files once.
-            if (std::find(doneDirs.begin(), doneDirs.end(), target) != doneDirs.end()) {
+            if (Holds(doneDirs, target)) {
                 continue;
             }
-            std::vector<std::string> items;
-            result = DeployPayloadToDirectory(payload, package, fs::path(target), items);
-            if (result != kPlaced) {
+            const Placed here = DeployPayloadToDirectory(payload, package, fs::path(target));
+            all.result = here.result;
+            if (here.result != kPlaced) {
                 break;
             }
-            Append(installedFiles, items);
+            Append(all.files, here.files);
             doneDirs.push_back(target);
         }
     }
-    // Fixed (contracts, placement): a failure does not stick. `result` is that of the last attempt, and where a later
+    // Fixed (contracts, placement): a failure does not stick. The result is that of the last attempt, and where a later
     // reference succeeds the payload has reached a host.
-    const bool placed = !IsFailure(result) && !doneDirs.empty();
-    return placed ? kPlaced : result;
+    if (!IsFailure(all.result) && !doneDirs.empty()) {
+        all.result = kPlaced;
+    }
+    return all;
 }
 
 // Fixed (contracts, placement): an exception leaves the result as it stood, unlike a copy that reports its failure.
-EngineResult Deploy::DeployPayloadToDirectory(Payload payload, const Package& package, const fs::path& destDir,
-                                              std::vector<std::string>& installedFiles) {
+Placed Placement::DeployPayloadToDirectory(const Payload& payload, const Package& package, const fs::path& destDir) {
     TraceEntry(kDeployClass, "DeployPayloadToDirectory");
-    EngineResult result = kNothingDone;
+    Placed placed;
     try {
-        CopyPayloadItems(payload, package, destDir, installedFiles, result);
+        CopyItems(payload, package, destDir, placed);
     } catch (const std::exception& error) {
         HVL_LOG(Error, "exception deploying payload " << payload.id << ": " << error.what());
     } catch (...) {
         HVL_LOG(Error, "unknown exception deploying payload " << payload.id);
     }
-    return result;
+    return placed;
 }
 
-void Deploy::CopyPayloadItems(const Payload& payload, const Package& package, const fs::path& destDir,
-                              std::vector<std::string>& installedFiles, EngineResult& result) {
+void Placement::CopyItems(const Payload& payload, const Package& package, const fs::path& destDir, Placed& placed) {
     std::vector<PayloadPathPair> items;
     package.GetPayloadPaths(destDir, payload, items);
     HVL_LOG(Debug, "Found " << items.size() << " items to copy.");
@@ -207,22 +198,21 @@ void Deploy::CopyPayloadItems(const Payload& payload, const Package& package, co
             continue;
         }
         // What is missing is made below a folder that is held, and is then itself held.
-        if (!target.HoldNearest(parent) || !EnsureParent(parent) || !target.HoldNearest(parent) ||
-            !CopyPayloadItem(item)) {
-            result = kDeploymentFailed;
+        if (!target.HoldNearest(parent) || !EnsureParent(parent) || !target.HoldNearest(parent) || !CopyItem(item)) {
+            placed.result = kDeploymentFailed;
             return;
         }
-        installedFiles.push_back(item.destination.string());
-        rollback.AddInstalledFile(package.manifest.packageIdentifier, payload.id, item.destination);
-        result = kPlaced;
+        placed.files.push_back(item.destination.string());
+        rollback_.AddInstalledFile(package.manifest.packageIdentifier, payload.id, item.destination);
+        placed.result = kPlaced;
     }
 }
 
-bool Deploy::CopyPayloadItem(const PayloadPathPair& item) {
+bool Placement::CopyItem(const PayloadPathPair& item) {
     const std::string source = item.source.string();
     const std::string destination = item.destination.string();
     if (fs::exists(item.destination) || fs::is_symlink(item.destination)) {
-        rollback.StashExistingFile(item.destination);
+        rollback_.StashExistingFile(item.destination);
     }
     HVL_LOG(Debug, "Copying from: " << source << "\n to: " << destination);
     if (const int error = FileUtils::CopyFileOrDirectory(source, destination); error != 0) {
