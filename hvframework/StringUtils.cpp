@@ -71,6 +71,25 @@ std::string StripQuotes(std::string_view text) {
     return std::string(text);
 }
 
+std::string Trim(std::string_view text) {
+    const std::size_t first = text.find_first_not_of(kWhiteSpace);
+    if (first == std::string_view::npos) {
+        return {};
+    }
+    return std::string(text.substr(first, text.find_last_not_of(kWhiteSpace) - first + 1));
+}
+
+std::string ToLower(std::string text) {
+    std::ranges::transform(text, text.begin(), [](char c) { return ToLower(c); });
+    return text;
+}
+
+std::string ToUpper(std::string text) {
+    std::ranges::transform(text, text.begin(),
+                           [](char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c; });
+    return text;
+}
+
 std::string GetEnvironmentValue(const std::string& name) {
     std::array<char, kEnvironmentBufferSize> buffer;
     const auto length = GetEnvironmentVariableA(name.c_str(), buffer.data(), static_cast<DWORD>(buffer.size()));

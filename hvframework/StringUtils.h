@@ -35,6 +35,21 @@ namespace HVL::StringUtils {
 /// itself: they need not match, and one alone is removed too.
 [[nodiscard]] std::string StripQuotes(std::string_view text);
 
+/// Blanks, tabs and all characters that end a line.
+inline constexpr std::string_view kWhiteSpace = " \t\n\v\f\r";
+
+/// A copy of `text` without the white space at both ends.
+[[nodiscard]] std::string Trim(std::string_view text);
+
+/// The letter in lower case, for the 26 letters of ASCII; any other character as it is.
+[[nodiscard]] constexpr char ToLower(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
+/// Copies of `text` in which the letters of ASCII are in lower, or in upper case.
+[[nodiscard]] std::string ToLower(std::string text);
+[[nodiscard]] std::string ToUpper(std::string text);
+
 /// The value of the environment variable `name`; empty when it is not set, is set to nothing, or does not fit into
 /// 8191 bytes.
 [[nodiscard]] std::string GetEnvironmentValue(const std::string& name);

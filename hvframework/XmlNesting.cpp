@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
+#include "hvframework/StringUtils.h"
+
 namespace HVL {
 namespace {
 
@@ -19,10 +21,6 @@ bool StartsName(char c) {
 
 bool ContinuesName(char c) {
     return StartsName(c) || (c >= '0' && c <= '9') || c == '-' || c == '.' || c == ':';
-}
-
-char Lower(char c) {
-    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
 }
 
 /// Steps over the text as the library does, without building anything and without recursion.
@@ -221,7 +219,8 @@ private:
     [[nodiscard]] bool AtDeclaration() const { return AtWord("<?xml"); }
     [[nodiscard]] bool At(const char* text) const { return std::strncmp(p_, text, std::strlen(text)) == 0; }
     [[nodiscard]] bool AtWord(const char* word) const {
-        return std::equal(word, word + std::strlen(word), p_, [](char a, char b) { return a == Lower(b); });
+        return std::equal(word, word + std::strlen(word), p_,
+                          [](char a, char b) { return a == StringUtils::ToLower(b); });
     }
 
     const char* p_;

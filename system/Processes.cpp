@@ -7,6 +7,7 @@
 #include <stdexcept>
 #include <string_view>
 
+#include "hvframework/StringUtils.h"
 #include "platform/win32.h"
 
 namespace HV {
@@ -68,10 +69,6 @@ bool ReadProcess(DWORD number, ProcessRecord& record) {
     return true;
 }
 
-char Lower(char c) {
-    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
-}
-
 }  // namespace
 
 Processes::Processes() {
@@ -122,7 +119,7 @@ std::string HostDisplayName(const ProcessRecord& record) {
     }
     const std::size_t stem = record.name.size() - extension.size();
     const bool isProgram = std::equal(extension.begin(), extension.end(), record.name.begin() + static_cast<int>(stem),
-                                      [](char wanted, char c) { return wanted == Lower(c); });
+                                      [](char wanted, char c) { return wanted == HVL::StringUtils::ToLower(c); });
     return isProgram ? record.name.substr(0, stem) : record.name;
 }
 

@@ -3,10 +3,12 @@
 #include <algorithm>
 #include <string_view>
 
+#include "hvframework/StringUtils.h"
+
 namespace HV {
 namespace {
 
-constexpr std::string_view kWhiteSpace = " \t\n\v\f\r";
+using HVL::StringUtils::kWhiteSpace;
 
 using Positions = std::vector<std::size_t>;
 

@@ -11,7 +11,6 @@
 
 #include <algorithm>
 #include <array>
-#include <cctype>
 #include <cstdio>
 #include <iostream>
 #include <memory>
@@ -35,7 +34,6 @@ using namespace HVL;
 constexpr std::array kCategories{"halvorn", "hvdeploy-detail"};
 constexpr std::size_t kLogValueBuffer = 16384;
 constexpr int kLogFileMode = 0644;
-constexpr const char* kWhiteSpace = " \t\n\v\f\r";
 
 std::string DefaultLogFolder() {
     return StringUtils::GetEnvironmentValue("PROGRAMDATA") + "\\Halvorn\\Logs";
@@ -65,20 +63,6 @@ log4cpp::Priority::Value PriorityFromName(const std::string& name) {
     return log4cpp::Priority::getPriorityValue(name);
 }
 
-std::string ToUpper(std::string text) {
-    std::transform(text.begin(), text.end(), text.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::toupper(c)); });
-    return text;
-}
-
-std::string Trim(const std::string& text) {
-    const std::size_t first = text.find_first_not_of(kWhiteSpace);
-    if (first == std::string::npos) {
-        return {};
-    }
-    return text.substr(first, text.find_last_not_of(kWhiteSpace) - first + 1);
-}
-
 // The first "log=" of the line counts here, though the arguments keep the last.
 std::string LogFileFromArgs(int argc, const char* const* argv) {
     constexpr const char* key = "log=";
@@ -94,7 +78,7 @@ std::string LogFileFromArgs(int argc, const char* const* argv) {
             << boost::throw_function("HV::DeployCLI::InitLogging") << boost::throw_file("hvdeploy/src/HVDeployCLI")
             << boost::throw_line(194);
     }
-    std::string name = Trim(value);
+    std::string name = StringUtils::Trim(value);
     if (!name.empty() && name.front() == '"') {
         name.erase(0, 1);
         if (!name.empty() && name.back() == '"') {
@@ -196,7 +180,7 @@ int SetCategoryLevelFromArgs(std::string categoryName, int argc, const char* con
             continue;
         }
         try {
-            log4cpp::Category::getInstance(categoryName).setPriority(PriorityFromName(ToUpper(pieces[1])));
+            log4cpp::Category::getInstance(categoryName).setPriority(PriorityFromName(StringUtils::ToUpper(pieces[1])));
             result = 1;
         } catch (const std::invalid_argument& error) {
             std::cerr << error.what() << std::endl;

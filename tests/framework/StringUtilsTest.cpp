@@ -107,6 +107,20 @@ TEST(StripQuotes, TakesALoneQuoteOnce) {
     EXPECT_EQ(StripQuotes("''"), "");
 }
 
+TEST(Trim, TakesWhiteSpaceFromBothEndsAlone) {
+    EXPECT_EQ(Trim(" \t\n\v\f\ra b\r\f\v\n\t "), "a b");
+    EXPECT_EQ(Trim("a"), "a");
+    EXPECT_EQ(Trim(kWhiteSpace), "");
+    EXPECT_EQ(Trim(""), "");
+}
+
+TEST(LetterCase, IsChangedForTheLettersOfAsciiAlone) {
+    EXPECT_EQ(ToLower("@AZ[`az{ \xC3\x84"), "@az[`az{ \xC3\x84");
+    EXPECT_EQ(ToUpper("@AZ[`az{ \xC3\xA4"), "@AZ[`AZ{ \xC3\xA4");
+    EXPECT_EQ(ToLower('Q'), 'q');
+    EXPECT_EQ(ToLower(std::string()), "");
+}
+
 class EnvironmentValue : public testing::Test {
 protected:
     Machine machine;
