@@ -2,12 +2,11 @@
 
 #include <algorithm>
 #include <stdexcept>
-#include <string_view>
 
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
-#include "hvframework/StringUtils.h"
 #include "hvframework/XmlNesting.h"
+#include "package/PackageNames.h"
 #include "package/PayloadSources.h"
 #include "package/ZipEntries.h"
 
@@ -16,7 +15,6 @@ namespace {
 
 using HVL::FileUtils::GetFileName;
 
-constexpr std::string_view kManifestEnding = "_hvmanifest.xml";
 constexpr const char* kAbsolutePathKeyword = "absolutepath";
 
 bool IsRegularFile(const fs::path& path) {
@@ -27,16 +25,6 @@ bool IsRegularFile(const fs::path& path) {
 bool IsDirectory(const fs::path& path) {
     boost::system::error_code error;
     return fs::is_directory(path, error);
-}
-
-bool HasPackageExtension(const fs::path& path) {
-    const std::string extension = path.extension().string();
-    return extension == ".zip" || extension == ".hvpkg";
-}
-
-/// The ending is compared, not the name: any root entry that ends so is a manifest.
-bool IsRootManifest(const std::string& entry) {
-    return HVL::StringUtils::EndsWith(entry, kManifestEnding) && entry.find('/') == std::string::npos;
 }
 
 std::string TextUpToZero(const std::vector<char>& bytes) {
@@ -56,7 +44,7 @@ void LogMissingSysDir(const std::string& name, const Payload& payload) {
 }  // namespace
 
 Package::Package(const fs::path& path) {
-    if (HasPackageExtension(path)) {
+    if (IsNamedAsPackage(path)) {
         if (!IsRegularFile(path)) {
             throw std::runtime_error("File not found at path " + path.string());
         }

@@ -7,9 +7,9 @@
 #include <vector>
 
 #include "hvframework/FileUtils.h"
-#include "hvframework/StringUtils.h"
 #include "package/EntryNames.h"
 #include "package/Package.h"
+#include "package/PackageNames.h"
 #include "platform/libraries.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/ReleaseNames.h"
@@ -62,7 +62,7 @@ void CollectItems(const fs::path& folder, const std::string& prefix, std::vector
 }
 
 bool IsRootManifest(const Item& item) {
-    return HVL::StringUtils::EndsWith(item.entry, "_hvmanifest.xml") && item.entry.find('/') == std::string::npos;
+    return HV::IsRootManifest(item.entry);
 }
 
 std::vector<Item> SortedItems(const fs::path& folder) {
@@ -171,7 +171,7 @@ private:
 };
 
 void RefuseUnlessNamedAsPackage(const fs::path& output) {
-    if (!IsNamedAsPackage(output)) {
+    if (!HV::IsNamedAsPackage(output)) {
         throw PackageError("a package is named .hvpkg or .zip, not " + output.filename().string());
     }
 }

@@ -6,7 +6,9 @@
 #include <string_view>
 
 #include "hvframework/FileUtils.h"
+#include "hvframework/StringUtils.h"
 #include "package/HeldFile.h"
+#include "package/PackageNames.h"
 #include "platform/win32.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/SoundPackage.h"
@@ -35,20 +37,16 @@ constexpr std::string_view kFoot =
     "    return kDigests;\n"
     "}\n";
 
+using HVL::StringUtils::ToLower;
+
 std::string FileName(const fs::path& path) {
     return path.filename().string();
-}
-
-std::string InLowerCase(std::string text) {
-    std::ranges::transform(text, text.begin(),
-                           [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; });
-    return text;
 }
 
 void RefuseOneNameForTwo(const std::vector<fs::path>& packages) {
     std::map<std::string, std::string> known;
     for (const fs::path& package : packages) {
-        const auto [other, isNew] = known.emplace(InLowerCase(FileName(package)), FileName(package));
+        const auto [other, isNew] = known.emplace(ToLower(FileName(package)), FileName(package));
         if (!isNew) {
             throw PackageError(other->second + " and " + FileName(package) + " are one name on Windows");
         }
@@ -120,7 +118,7 @@ std::vector<fs::path> PackagesIn(const fs::path& folder) {
     }
     std::vector<fs::path> packages;
     for (const fs::directory_entry& entry : fs::directory_iterator(folder)) {
-        if (IsNamedAsPackage(fs::path(InLowerCase(FileName(entry.path())))) && fs::is_regular_file(entry.path())) {
+        if (HV::IsNamedAsPackage(fs::path(ToLower(FileName(entry.path())))) && fs::is_regular_file(entry.path())) {
             packages.push_back(entry.path());
         }
     }
@@ -154,7 +152,7 @@ std::string TableSource(const std::vector<ReleaseRow>& rows) {
 }
 
 void WriteSource(const fs::path& output, const std::string& text) {
-    if (IsNamedAsPackage(output)) {
+    if (HV::IsNamedAsPackage(output)) {
         throw PackageError("a table is not named as a package is: " + output.string());
     }
     std::string present;

@@ -6,11 +6,6 @@
 
 namespace HVPack {
 
-bool IsNamedAsPackage(const fs::path& file) {
-    const std::string extension = file.extension().string();
-    return extension == ".hvpkg" || extension == ".zip";
-}
-
 bool IsSound(HV::Package& package) {
     return package.Validate(false) && HV::CheckZip(package.zipPath.string()) == 0;
 }

@@ -6,9 +6,6 @@
 
 namespace HVPack {
 
-/// Whether a file is named as packages are, ".hvpkg" or ".zip", in lower case.
-[[nodiscard]] bool IsNamedAsPackage(const fs::path& file);
-
 /// Whether the engine would take the package and every entry of it: what it asks before it unpacks, and unpacking,
 /// which writes nothing here. The reasons are in the log. Fills in what the engine reads.
 [[nodiscard]] bool IsSound(HV::Package& package);
