@@ -1,16 +1,20 @@
 // What the model knows of the packages folder: which files are there, whether each is what this build may install, and
 // what the wizard has to know of it.
 #include <algorithm>
+#include <functional>
 #include <iostream>
 #include <optional>
 #include <set>
 #include <tuple>
 #include <utility>
 
+#include "hvdeploy/src/PackagesFolder.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "installer/InstallerModel.h"
 #include "package/Package.h"
+#include "package/PackageNames.h"
+#include "package/ValidationTable.h"
 #include "platform/filesystem.h"
 
 namespace HV {
@@ -24,44 +28,27 @@ struct FolderFiles {
     std::string suiteJsonPath;
 };
 
-std::string InLowerCase(std::string text) {
-    std::ranges::transform(text, text.begin(),
-                           [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; });
-    return text;
-}
-
-// The engine passes over the case of an extension.
-bool IsReadByEngine(const fs::path& path) {
-    const std::string extension = InLowerCase(path.extension().string());
-    return extension == ".zip" || extension == ".hvpkg" || extension == ".json";
-}
-
 // The case of an extension counts here, though the engine passes over it: the name of a package has to stand in the
 // table of this build, to the letter.
 void AddFile(const fs::path& path, FolderFiles& files) {
-    const std::string extension = path.extension().string();
-    if (extension == ".zip" || extension == ".hvpkg") {
+    const bool isSuite = path.extension().string() == kSuiteEnding;
+    if (IsNamedAsPackage(path)) {
         files.packageFiles.push_back(path.string());
-    } else if (extension == ".json" && files.suiteJsonPath.empty()) {
+    } else if (isSuite && files.suiteJsonPath.empty()) {
         files.suiteJsonPath = path.string();
-    } else if (extension == ".json") {
+    } else if (isSuite) {
         std::cerr << "WARNING: found additional json file at root level of packages dir: " << path << std::endl;
     }
 }
 
-/// Hands every regular file directly in the folder to `take`; whether the folder could be listed to its end.
-template <class Take>
-bool ListFolder(const std::string& folder, Take take) {
-    boost::system::error_code error;
-    fs::directory_iterator entry(fs::path(folder), error);
-    while (!error && entry != fs::directory_iterator()) {
-        boost::system::error_code unknown;
-        if (fs::is_regular_file(entry->status(unknown))) {
-            take(entry->path());
-        }
-        entry.increment(error);
+/// ForEachFile(), and whether the folder could be listed to its end.
+bool ListFolder(const std::string& folder, const std::function<void(const fs::path&)>& take) {
+    try {
+        ForEachFile(fs::path(folder), take);
+        return true;
+    } catch (const fs::filesystem_error&) {
+        return false;
     }
-    return !error;
 }
 
 void LogStranger(const std::string& name) {
@@ -186,7 +173,7 @@ bool InstallerModel::ScanPackages() {
 // Before the first is read. The engine reads one of them too, and which one is the system's order.
 void InstallerModel::HoldSuites() {
     (void)ListFolder(packagesDirectory, [this](const fs::path& path) {
-        if (InLowerCase(path.extension().string()) == ".json") {
+        if (IsNamedAsSuite(path)) {
             held_.emplace_back(path);
         }
     });
@@ -244,7 +231,7 @@ bool InstallerModel::PackagesAreUntouched() const {
     const std::set<std::string> known = NamesOfRelease();
     std::vector<std::string> strangers;
     const bool listed = ListFolder(packagesDirectory, [&](const fs::path& path) {
-        if (IsReadByEngine(path) && !known.contains(path.filename().string())) {
+        if (IsReadByRun(path) && !known.contains(path.filename().string())) {
             strangers.push_back(path.filename().string());
         }
     });

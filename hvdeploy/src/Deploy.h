@@ -12,6 +12,7 @@
 #include "hvdeploy/src/DeployRollback.h"
 #include "hvdeploy/src/EngineResult.h"
 #include "hvdeploy/src/InstalledHistory.h"
+#include "hvdeploy/src/PackagesFolder.h"
 #include "hvdeploy/src/Placement.h"
 #include "hvdeploy/src/RunProgress.h"
 #include "hvdeploy/src/UninstallScripts.h"
@@ -112,28 +113,10 @@ public:
     const std::map<std::string, ValidationInfo>& KnownPackages() const { return validationInfo; }
 
 private:
-    /// What a walk over a packages folder finds.
-    struct FolderContent {
-        std::uint64_t packageBytes = 0;
-        std::vector<fs::path> preflightPackages;
-        std::vector<fs::path> mainPackages;
-        std::vector<fs::path> postflightPackages;
-        std::vector<fs::path> synthesisPackages;
-        fs::path suitePath;
-        bool hasStranger = false;
-    };
-
     // The run over a folder.
-    FolderContent ScanFolder(const fs::path& dir);
-    [[nodiscard]] bool IsAccepted(const fs::path& file) const;
-    void AddPackageFile(const fs::path& path, FolderContent& content);
-    void ReadSuiteInfo(const FolderContent& content);
-    bool ReadSuiteFile(const fs::path& suitePath);
-    bool AcceptSuiteText(const std::string& text, const fs::path& suitePath);
-    bool ReadSuiteText(const std::string& text, const fs::path& suitePath);
-    bool IsSuite(const fs::path& suitePath) const;
+    void ReadSuiteInfo(const PackagesFolder& folder);
     EngineResult RunPreflightPhase(const std::vector<fs::path>& packages);
-    EngineResult RunMainPhases(const FolderContent& content);
+    EngineResult RunMainPhases(const PackagesFolder& folder);
     EngineResult DeployEach(const std::vector<fs::path>& paths);
     bool LoadValidationInfo();
 

@@ -1,11 +1,6 @@
 // The run over a folder: which file is what, and in which order the packages go.
-#include <algorithm>
-#include <cctype>
-#include <iterator>
-
 #include "hvdeploy/src/Deploy.h"
 #include "hvdeploy/src/EntryTrace.h"
-#include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
 #include "hvframework/StringUtils.h"
 
@@ -15,22 +10,6 @@ namespace {
 // Fixed (contracts, packages folder): the name is reserved. The engine treats no package apart from the others by its
 // identifier, this one neither.
 [[maybe_unused]] constexpr const char* kRuntimePackage = "com.halvorn.vcredist-x64-2012";
-constexpr const char* kPreflightPrefix = "preflight-";
-constexpr const char* kPostflightPrefix = "postflight-";
-
-std::string ToLower(std::string text) {
-    std::transform(text.begin(), text.end(), text.begin(),
-                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
-    return text;
-}
-
-bool IsPackageExtension(const std::string& extension) {
-    return extension == ".zip" || extension == ".hvpkg";
-}
-
-bool IsRead(const std::string& extension) {
-    return IsPackageExtension(extension) || extension == ".json";
-}
 
 // A suite in a test phase says so in its name.
 std::string SuiteDisplayName(const std::string& identifier, std::string displayName) {
@@ -38,7 +17,7 @@ std::string SuiteDisplayName(const std::string& identifier, std::string displayN
         displayName = "Unknown";
     }
     const bool isBeta = identifier.find("-beta") != std::string::npos;
-    if (isBeta && ToLower(displayName).find("beta") == std::string::npos) {
+    if (isBeta && HVL::StringUtils::ToLower(displayName).find("beta") == std::string::npos) {
         displayName += " Beta";
     }
     return displayName;
@@ -100,19 +79,19 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
         HVL_LOG(Error, "'" << dir << "' is not a directory.");
         return kDeploymentFailed;
     }
-    const FolderContent content = ScanFolder(dir);
-    if (content.hasStranger) {
+    const PackagesFolder folder = ReadPackagesFolder(dir, acceptedNames);
+    if (folder.hasStranger) {
         return kDeploymentFailed;
     }
-    progress.DivideAmong(content.packageBytes);
-    ReadSuiteInfo(content);
+    progress.DivideAmong(folder.packageBytes);
+    ReadSuiteInfo(folder);
 
-    const EngineResult preflightResult = RunPreflightPhase(content.preflightPackages);
+    const EngineResult preflightResult = RunPreflightPhase(folder.preflightPackages);
     if (IsFailure(preflightResult)) {
         HVL_LOG(Crit, "** Preflight package install returned " << preflightResult);
         return preflightResult;
     }
-    const EngineResult result = RunMainPhases(content);
+    const EngineResult result = RunMainPhases(folder);
     // Fixed (contracts, packages folder): a failed run reports this too. Its result tells the listener.
     progress.SetTo(100.0F, "Installation complete.");
     if (!IsFailure(result)) {
@@ -122,94 +101,17 @@ EngineResult Deploy::DeployPackagesFromDirectory(const fs::path& dir, const std:
     return result;
 }
 
-Deploy::FolderContent Deploy::ScanFolder(const fs::path& dir) {
-    FolderContent content;
-    for (const fs::directory_entry& entry : fs::directory_iterator(dir)) {
-        if (!fs::is_regular_file(entry.status())) {
-            continue;
-        }
-        const fs::path& path = entry.path();
-        const std::string extension = ToLower(path.extension().string());
-        if (IsRead(extension) && !IsAccepted(path)) {
-            content.hasStranger = true;
-        } else if (IsPackageExtension(extension)) {
-            AddPackageFile(path, content);
-        } else if (extension == ".json" && content.suitePath.empty()) {
-            HVL_LOG(Debug, "Located suite .json file...");
-            content.suitePath = path;
-        } else if (extension == ".json") {
-            HVL_LOG(Warn, "found additional json file at root level of packages dir: " << path);
-        }
-    }
-    return content;
-}
-
-// Which files a release consists of is known to whoever has tested it; what has come since is none of them.
-bool Deploy::IsAccepted(const fs::path& file) const {
-    const std::string name = file.filename().string();
-    if (!acceptedNames || acceptedNames->contains(name)) {
-        return true;
-    }
-    HVL_LOG(Error, "ERROR: " << name << " is not valid payload.");
-    return false;
-}
-
-// Packages to skip are listed and counted like all others and fall out later, so the percentages do not depend on them.
-// None is added to the packages that a suite could be synthesised from: a folder without a suite file has no suite.
-void Deploy::AddPackageFile(const fs::path& path, FolderContent& content) {
-    content.packageBytes += fs::file_size(path);
-    const std::string name = ToLower(path.filename().string());
-    if (HVL::StringUtils::StartsWith(name, kPreflightPrefix)) {
-        content.preflightPackages.push_back(path);
-    } else if (HVL::StringUtils::StartsWith(name, kPostflightPrefix)) {
-        content.postflightPackages.push_back(path);
-    } else {
-        content.mainPackages.push_back(path);
-    }
-}
-
 // A run without a suite goes on with an empty record.
-void Deploy::ReadSuiteInfo(const FolderContent& content) {
-    if (!content.suitePath.empty() && ReadSuiteFile(content.suitePath)) {
+void Deploy::ReadSuiteInfo(const PackagesFolder& folder) {
+    if (!folder.suitePath.empty() && ReadSuiteFile(folder.suitePath, suiteInfo)) {
         return;
     }
     std::string text;
-    if (!SynthesizeSuiteInfoFromProducts(content.synthesisPackages, text)) {
-        HVL_LOG(Warn, "failed to read suite data from file " << content.suitePath);
+    if (!SynthesizeSuiteInfoFromProducts(folder.synthesisPackages, text)) {
+        HVL_LOG(Warn, "failed to read suite data from file " << folder.suitePath);
         return;
     }
-    AcceptSuiteText(text, content.suitePath);
-}
-
-bool Deploy::ReadSuiteFile(const fs::path& suitePath) {
-    std::string text;
-    return HVL::FileUtils::ReadFileToString(suitePath.string(), text) == 0 && AcceptSuiteText(text, suitePath);
-}
-
-bool Deploy::AcceptSuiteText(const std::string& text, const fs::path& suitePath) {
-    if (!ReadSuiteText(text, suitePath)) {
-        HVL_LOG(Warn, "failed to read suite data from file " << suitePath);
-        return false;
-    }
-    return IsSuite(suitePath);
-}
-
-// An exception ends the run, and what it says itself may be the library's own words alone: the file is named here.
-bool Deploy::ReadSuiteText(const std::string& text, const fs::path& suitePath) {
-    try {
-        return suiteInfo.ReadJSON(text);
-    } catch (const std::exception& error) {
-        HVL_LOG(Error, "cannot take suite data from file " << suitePath << ": " << error.what());
-        throw;
-    }
-}
-
-bool Deploy::IsSuite(const fs::path& suitePath) const {
-    if (suiteInfo.GetProductType() != 0) {
-        HVL_LOG(Warn, "non-suite product type encountered in json file " << suitePath);
-        return false;
-    }
-    return true;
+    TakeSuiteText(text, folder.suitePath, suiteInfo);
 }
 
 bool Deploy::SynthesizeSuiteInfoFromProducts(const std::vector<fs::path>& packages, std::string& suiteText) {
@@ -252,16 +154,16 @@ EngineResult Deploy::RunPreflightPhase(const std::vector<fs::path>& packages) {
     }
 }
 
-EngineResult Deploy::RunMainPhases(const FolderContent& content) {
+EngineResult Deploy::RunMainPhases(const PackagesFolder& folder) {
     HVL_LOG(Info, "Deploying Main Packages");
     HVL_LOG(Info, "------------------------");
-    EngineResult result = DeployPackages(content.mainPackages);
+    EngineResult result = DeployPackages(folder.mainPackages);
     if (IsFailure(result)) {
         HVL_LOG(Error, "Main package install returned " << result);
     }
     progress.SetTo(98.0F, "Completing installation.");
     if (!IsFailure(result)) {
-        result = DeployPackages(content.postflightPackages);
+        result = DeployPackages(folder.postflightPackages);
         if (IsFailure(result)) {
             HVL_LOG(Error, "Postflight package install returned " << result);
         }
