@@ -3,7 +3,7 @@
 #include <utility>
 
 #include "hvframework/Log.h"
-#include "hvframework/XmlNesting.h"
+#include "hvframework/XmlText.h"
 #include "package/XmlReaders.h"
 
 namespace HV {
@@ -19,8 +19,7 @@ bool ReadRequired(const TiXmlElement& root, const char* name, std::string& out, 
     return false;
 }
 
-/// What stands in for a missing short name: the identifier from its last dot onward. The dot stays: the names that are
-/// made of it are known with it, on every machine where such a product is installed.
+/// Fixed (contracts, manifest): what stands in for a missing short name keeps the dot.
 std::string ShortNameOf(const std::string& productId) {
     const auto dot = productId.rfind('.');
     return dot == std::string::npos ? productId : productId.substr(dot);
@@ -93,21 +92,12 @@ bool ReadPayloads(const TiXmlElement& root, std::vector<Payload>& payloads) {
     return true;
 }
 
-/// The library trusts its input in ways that a package from outside must not be trusted in: it steps over the end of a
-/// text that stops within a character, hence the zeros behind it, goes as deep as elements are nested, and takes time
-/// and memory as the text wants.
 bool ParseTree(const std::string& text, TiXmlDocument& document) {
-    const std::string padded = text + std::string(HVL::kXmlPadding, '\0');
-    if (const std::string excess = HVL::ExcessOfXml(padded); !excess.empty()) {
-        HVL_LOG(Error, "XML parsing failed: " << excess);
-        return false;
+    const std::string problem = HVL::ReadXml(text, document);
+    if (!problem.empty()) {
+        HVL_LOG(Error, "XML parsing failed: " << problem);
     }
-    document.Parse(padded.c_str(), nullptr, TIXML_ENCODING_UNKNOWN);
-    if (document.Error()) {
-        HVL_LOG(Error, "XML parsing failed: " << document.ErrorDesc());
-        return false;
-    }
-    return true;
+    return problem.empty();
 }
 
 }  // namespace

@@ -5,7 +5,7 @@
 #include <iostream>
 #include <utility>
 
-#include "hvframework/XmlNesting.h"
+#include "hvframework/XmlText.h"
 #include "platform/win32.h"
 
 namespace HV {
@@ -26,16 +26,6 @@ void Say(const std::string& line) {
 bool Refuse(const std::string& line) {
     Say(line);
     return false;
-}
-
-/// Without a word when the text is no XML, or more than the library would survive.
-bool ReadTree(const std::string& xml, TiXmlDocument& document) {
-    const std::string padded = xml + std::string(HVL::kXmlPadding, '\0');
-    if (!HVL::ExcessOfXml(padded).empty()) {
-        return false;
-    }
-    document.Parse(padded.c_str(), nullptr, TIXML_ENCODING_UNKNOWN);
-    return !document.Error();
 }
 
 // Only a text that comes first counts: an element that begins with a comment has none.
@@ -86,9 +76,8 @@ bool ReadLanguage(const TiXmlElement& element, std::map<std::string, Texts>& lan
     return true;
 }
 
-// What is inserted is not looked at again. The look ends where the text ended before, not where it ends now: a token
-// that longer replacements have pushed beyond that stays as it is. That is how the tables of all releases have been
-// read, and a name that fills three times its place would not fit the window either way.
+// What is inserted is not looked at again. Fixed (contracts, texts): the look ends where the text ended before, not
+// where it ends now, and a token that longer replacements have pushed beyond that stays as it is.
 bool ReplaceIn(std::string& text, const std::string& token, const std::string& replacement) {
     const std::size_t end = text.size();
     bool replaced = false;
@@ -104,7 +93,7 @@ bool ReplaceIn(std::string& text, const std::string& token, const std::string& r
 bool XMLStringsResource::Parse(const std::string& xml) {
     languages.clear();
     TiXmlDocument document;
-    if (!ReadTree(xml, document)) {
+    if (!HVL::ReadXml(xml, document).empty()) {
         return false;
     }
     const TiXmlElement* root = document.FirstChildElement();
