@@ -17,7 +17,6 @@ constexpr std::size_t kLargestValue = 65535;
 constexpr std::size_t kSubkeyNameSize = 256;
 
 constexpr std::string_view kComputerPrefix = "Computer\\";
-constexpr const char* kUninstallPath = "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall";
 
 bool IsPredefined(HKEY handle) {
     const std::array predefined = {
@@ -220,7 +219,7 @@ bool Win32RegKeyHandle::ParseRegistryPath(const std::string& text, HKEY& hive, s
 }
 
 bool Win32RegKeyHandle::OpenUninstallKey(const std::string& entryName, Win32RegKeyHandle& output) {
-    Win32RegKeyHandle list(HKEY_LOCAL_MACHINE, kUninstallPath, true);
+    Win32RegKeyHandle list(HKEY_LOCAL_MACHINE, kInstalledProgramsPath, true);
     output = Win32RegKeyHandle(list.key, entryName, true);
     list.Close();
     return output.key != nullptr;

@@ -8,6 +8,9 @@
 
 namespace HV {
 
+/// The machine's list of installed programs, below HKEY_LOCAL_MACHINE: a key for each.
+inline constexpr const char* kInstalledProgramsPath = "SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall";
+
 /// An owned registry key, with opening by path and reading of values as text.
 ///
 /// Everything goes through the ANSI forms of the registry interface and sees the program's native view. Nothing raises
@@ -57,7 +60,7 @@ public:
     [[nodiscard]] static bool OpenPath(HKEY root, const std::string& path, Win32RegKeyHandle& output, bool create);
 
     /// Takes `Computer\HKEY_CURRENT_USER\Software\x` apart into its hive and the path below it; the leading
-    /// "Computer\" may be missing. Returns false, with the outputs as they were, when there is no `\` behind the hive's
+    /// "Computer\" may be missing. Returns false, with the outputs as they were, when there is no `\` after the hive's
     /// name or the name is unknown.
     [[nodiscard]] static bool ParseRegistryPath(const std::string& text, HKEY& hive, std::string& path);
 

@@ -31,7 +31,7 @@ std::string SuiteText(const std::string& identifier, const std::string& version,
 
 }  // namespace
 
-Deploy::Deploy(ProgressListenerInterface* listener) : history(kHistoryFolder), progress(listener) {
+Deploy::Deploy(ProgressListenerInterface* listener) : history(HistoryFolder()), progress(listener) {
     if (listener != nullptr) {
         AddProgress(1.0F);
         ReportProgress("Preparing to install...", 0);

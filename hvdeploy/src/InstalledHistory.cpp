@@ -2,17 +2,20 @@
 
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
+#include "package/PackageNames.h"
 #include "platform/filesystem.h"
+#include "system/SystemDirectories.h"
 
 namespace HV {
 namespace {
 
-constexpr const char* kRecordEnding = "_hvmanifest.xml";
 constexpr const char* kVersionMark = "_v";
 
 }  // namespace
 
-const char* const kHistoryFolder = "C:\\ProgramData\\Halvorn\\.hvdeploy\\history";
+std::string HistoryFolder() {
+    return GetSystemDirectory(SysDir::History).string();
+}
 
 std::vector<std::string> ReadHistoryStems(const std::string& folder) {
     std::vector<std::string> stems;
@@ -21,8 +24,8 @@ std::vector<std::string> ReadHistoryStems(const std::string& folder) {
     }
     for (const fs::directory_entry& entry : fs::directory_iterator(fs::path(folder))) {
         const std::string name = entry.path().filename().string();
-        if (HVL::StringUtils::EndsWith(name, kRecordEnding) && fs::is_regular_file(entry.status())) {
-            stems.push_back(name.substr(0, name.size() - std::string(kRecordEnding).size()));
+        if (HVL::StringUtils::EndsWith(name, kManifestEnding) && fs::is_regular_file(entry.status())) {
+            stems.push_back(name.substr(0, name.size() - kManifestEnding.size()));
         }
     }
     return stems;
@@ -38,11 +41,6 @@ std::string VersionOfStem(const std::string& stem) {
         return stem;
     }
     return stem.substr(mark + 2);
-}
-
-const std::vector<std::string>& InstalledHistory::Stems() {
-    Read();
-    return stems;
 }
 
 const std::vector<std::string>& InstalledHistory::Identifiers() {

@@ -17,16 +17,11 @@ class InstalledHistory {
 public:
     explicit InstalledHistory(std::string historyFolder) : folder(std::move(historyFolder)) {}
 
-    /// File names without their ending, in the folder's order. Empty when the folder is missing.
-    const std::vector<std::string>& Stems();
-
-    /// The products that are installed, each once, in the order of Stems().
+    /// The products that are installed, each once, in the folder's order. Empty when the folder is missing.
     const std::vector<std::string>& Identifiers();
 
-    /// The installed versions of `identifier`, in the order of Stems(); empty when it is not installed.
+    /// The installed versions of `identifier`, in the folder's order; empty when it is not installed.
     const std::vector<HVL::Version>& Versions(const std::string& identifier);
-
-    bool Holds(const std::string& identifier) { return !Versions(identifier).empty(); }
 
 private:
     void Read();
@@ -38,15 +33,16 @@ private:
 };
 
 /// The folder that records what is installed. It is a fixed place and not looked up in the environment.
-extern const char* const kHistoryFolder;
+[[nodiscard]] std::string HistoryFolder();
 
-/// The stems of `folder`: one for each regular file whose name ends in "_hvmanifest.xml".
+/// The stems of `folder`, in its order: one for each regular file whose name ends in "_hvmanifest.xml", without that
+/// ending.
 std::vector<std::string> ReadHistoryStems(const std::string& folder);
 
 /// The text of a stem before the first "_v", or all of it.
 std::string IdentifierOfStem(const std::string& stem);
 
-/// The text of a stem behind the first "_v", or all of it when nothing stands there.
+/// The text of a stem after the first "_v", or all of it when nothing stands there.
 std::string VersionOfStem(const std::string& stem);
 
 }  // namespace HV

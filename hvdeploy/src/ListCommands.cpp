@@ -47,7 +47,7 @@ int DeployCLI::ListHosts() {
 
 int DeployCLI::ListInstalled() {
     TraceEntry(kDeployCLIClass, "ListInstalled");
-    std::vector<std::string> stems = ReadHistoryStems(kHistoryFolder);
+    std::vector<std::string> stems = ReadHistoryStems(HistoryFolder());
     std::sort(stems.begin(), stems.end());
     for (const std::string& stem : stems) {
         std::cout << stem << '\n';

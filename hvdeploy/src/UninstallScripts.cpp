@@ -21,7 +21,6 @@ namespace {
 using namespace HVL::FileUtils;
 
 constexpr const char* kScriptFolder = "C:\\ProgramData\\Halvorn\\uninstall";
-constexpr const char* kUninstallKey = "HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall\\";
 
 // The version is part of the name, so a new version gets an entry of its own, and the older one stays until its script
 // removes it.
@@ -30,7 +29,8 @@ std::string EntryName(const HVL::ProductData& product) {
 }
 
 std::string RegistryDeleteLine(const HVL::ProductData& product) {
-    return "CALL reg delete \"" + (kUninstallKey + EntryName(product)) + "\" /f";
+    const std::string key = std::string("HKEY_LOCAL_MACHINE\\") + kInstalledProgramsPath + "\\" + EntryName(product);
+    return "CALL reg delete \"" + key + "\" /f";
 }
 
 // The call of the separate uninstaller up to the closing quote of its path; the machine's folders do not move while

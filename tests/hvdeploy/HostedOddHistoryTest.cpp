@@ -13,10 +13,10 @@ namespace {
 
 class HostedOddHistoryTest : public CommandLineTest {
 protected:
-    HostedOddHistoryTest() { machine.HasFolder(HV::kHistoryFolder); }
+    HostedOddHistoryTest() { machine.HasFolder(HV::HistoryFolder()); }
 
     std::string OnHost(const std::string& stem) const {
-        return machine.HostName(HV::kHistoryFolder) + "/" + stem + "_hvmanifest.xml";
+        return machine.HostName(HV::HistoryFolder()) + "/" + stem + "_hvmanifest.xml";
     }
     static std::string Listed() {
         const ProgramResult result = RunProgram("hvdeploy", {"list=installed", "loglevel=emerg"});
