@@ -23,9 +23,6 @@ constexpr std::uint16_t kEncryptedFlag = 1;
 /// Deflate's shortest code stands for 258 bytes in two bits. Whoever claims more is not telling the truth.
 constexpr std::uint64_t kBestDeflateRatio = 1032;
 
-/// What an archive says when its number of entries does not fit into the field: this many, or any number above.
-constexpr std::uint64_t kCountThatDoesNotFit = 0xFFFF;
-
 constexpr std::uint64_t kLargestFile = 0xFFFFFFFF;
 
 /// An entry's header without its name, in the directory and before its bytes.

@@ -14,6 +14,9 @@
 
 namespace HV {
 
+/// The number of entries from which on the end of an archive's directory cannot tell it: it says this one.
+inline constexpr std::uint64_t kCountThatDoesNotFit = 0xFFFF;
+
 /// An archive that is open for reading, with its list of entries; closes all that is open when it goes out of scope.
 ///
 /// The directory of the archive is read once, by the constructor. An archive whose directory cannot be read to its end,

@@ -212,13 +212,13 @@ TEST_F(UnpackablePackageTest, AreRefusedForTwoNamesThatAreOneOnWindows) {
 }
 
 /// A package with one payload for hosts and one for a system directory, which a test spoils.
-class DoubtfulPackageTest : public HvpackTest {
+class PackageWarningsTest : public HvpackTest {
 protected:
-    DoubtfulPackageTest() {
+    PackageWarningsTest() {
         description.Payload("plugin").Id("effect").File("Glow.aex", "bytes").Subpath("Halvorn/Glow");
     }
     /// What `check` says, after the words that each warning begins with.
-    std::string Doubt() {
+    std::string Warning() {
         (void)description.Named("glow.hvpkg").WriteTo(R"(C:\out)");
         EXPECT_EQ(Run({"check", R"(C:\out\glow.hvpkg)"}), 0) << err;
         EXPECT_EQ(out, "OK C:\\out\\glow.hvpkg\n");
@@ -229,7 +229,7 @@ protected:
     PackageBuilder description{"com.halvorn.glow"};
 };
 
-TEST_F(DoubtfulPackageTest, HasNoDoubtsWhenEveryWordIsKnown) {
+TEST_F(PackageWarningsTest, AreNoneWhenEveryWordIsKnown) {
     int known = 0;
     for (const char* host : {"aftereffects", "aftereffectsMC", "aftereffects+premiere", "premiere", "edius", "hitfilm",
                              "mediacomposer", "resolve", "vegas", "ofx", "finalcutprox", "motion"}) {
@@ -237,40 +237,40 @@ TEST_F(DoubtfulPackageTest, HasNoDoubtsWhenEveryWordIsKnown) {
         ++known;
     }
     description.Payload("help").To("commondocs", "Halvorn...").File("Read me.txt", "text");
-    EXPECT_EQ(Doubt(), "");
+    EXPECT_EQ(Warning(), "");
     EXPECT_EQ(known, 12);
 }
 
-TEST_F(DoubtfulPackageTest, WarnsOfAnUnknownType) {
+TEST_F(PackageWarningsTest, TellOfAnUnknownType) {
     description.Payload("Library").Id("core").To("programdata").File("Core.dll", "bytes");
-    EXPECT_EQ(Doubt(), "payload core has an unknown type\n");
+    EXPECT_EQ(Warning(), "payload core has an unknown type\n");
 }
 
-TEST_F(DoubtfulPackageTest, WarnsOfAnUnknownHost) {
+TEST_F(PackageWarningsTest, TellOfAnUnknownHost) {
     description.ForHost("resolve").ForHost("After Effects");
-    EXPECT_EQ(Doubt(), "payload effect has the unknown host-ref \"After Effects\"\n");
+    EXPECT_EQ(Warning(), "payload effect has the unknown host-ref \"After Effects\"\n");
 }
 
-TEST_F(DoubtfulPackageTest, WarnsOfAnUnknownSystemDirectory) {
+TEST_F(PackageWarningsTest, TellOfAnUnknownSystemDirectory) {
     description.Payload("help").Id("manual").To("CommonDocs").File("Read me.txt", "text");
-    EXPECT_EQ(Doubt(), "payload manual has the unknown sysdir \"CommonDocs\"\n");
+    EXPECT_EQ(Warning(), "payload manual has the unknown sysdir \"CommonDocs\"\n");
 }
 
-TEST_F(DoubtfulPackageTest, WarnsOfASubpathThatLeavesItsFolder) {
+TEST_F(PackageWarningsTest, TellOfASubpathThatLeavesItsFolder) {
     description.Subpath("Halvorn/../../Other");
-    EXPECT_EQ(Doubt(), "payload effect leaves its folder: \"..\" stands in its subpath\n");
+    EXPECT_EQ(Warning(), "payload effect leaves its folder: \"..\" stands in its subpath\n");
 }
 
-TEST_F(DoubtfulPackageTest, PassesOverPayloadsForOtherSystems) {
+TEST_F(PackageWarningsTest, PassOverPayloadsForOtherSystems) {
     description.Payload("Bundle").Os("mac").To("nowhere", "../..").ForHost("nobody").File("Glow.plugin", "bytes");
-    EXPECT_EQ(Doubt(), "");
+    EXPECT_EQ(Warning(), "");
 }
 
-TEST_F(DoubtfulPackageTest, IsMadeAllTheSameWithAWarning) {
+TEST_F(PackageWarningsTest, DoNotKeepAPackageFromBeingMade) {
     description.ForHost("premier");
-    machine.Has(R"(C:\doubtful\_hvmanifest.xml)", description.Manifest());
-    machine.Has(R"(C:\doubtful\Glow.aex)", "bytes");
-    EXPECT_EQ(Run({"make", R"(C:\doubtful)", R"(C:\glow.hvpkg)"}), 0);
+    machine.Has(R"(C:\odd\_hvmanifest.xml)", description.Manifest());
+    machine.Has(R"(C:\odd\Glow.aex)", "bytes");
+    EXPECT_EQ(Run({"make", R"(C:\odd)", R"(C:\glow.hvpkg)"}), 0);
     EXPECT_EQ(out, "OK C:\\glow.hvpkg\n");
     EXPECT_EQ(err, "hvpack: WARNING: C:\\glow.hvpkg: payload effect has the unknown host-ref \"premier\"\n");
 }

@@ -7,12 +7,12 @@
 
 #include "hvframework/Log.h"
 #include "package/ZipEntries.h"
-#include "tools/hvpack/Doubts.h"
+#include "tools/hvpack/ManifestWarnings.h"
 #include "tools/hvpack/PackageError.h"
 #include "tools/hvpack/PackageMaker.h"
 #include "tools/hvpack/ReleaseNames.h"
 #include "tools/hvpack/ReleaseTable.h"
-#include "tools/hvpack/SoundPackage.h"
+#include "tools/hvpack/ValidatedPackage.h"
 
 namespace HVPack {
 namespace {
@@ -68,8 +68,8 @@ bool Report(std::ostream& err, Step step) {
 
 /// Warns of what the engine takes without a word. The exit status does not know of it.
 void Warn(const HV::Manifest& manifest, const std::string& file, std::ostream& err) {
-    for (const std::string& doubt : DoubtsAbout(manifest)) {
-        err << "hvpack: WARNING: " << file << ": " << doubt << '\n';
+    for (const std::string& warning : WarningsAbout(manifest)) {
+        err << "hvpack: WARNING: " << file << ": " << warning << '\n';
     }
 }
 
@@ -86,11 +86,7 @@ bool IsSuiteFile(const fs::path& file) {
 }
 
 bool CheckOne(const std::string& file, std::ostream& out, std::ostream& err) {
-    if (IsSuiteFile(fs::path(file))) {
-        RefuseUnlessSuite(file);
-    } else {
-        Warn(SoundPackage(file).manifest, file, err);
-    }
+    Warn(ValidatedPackage(file).manifest, file, err);
     out << "OK " << file << '\n';
     return true;
 }

@@ -10,11 +10,11 @@
 #include "package/EntryNames.h"
 #include "package/Package.h"
 #include "package/PackageNames.h"
+#include "package/ZipEntries.h"
 #include "platform/libraries.h"
 #include "tools/hvpack/PackageError.h"
-#include "tools/hvpack/ReleaseNames.h"
-#include "tools/hvpack/SoundPackage.h"
-#include "tools/hvpack/WideCount.h"
+#include "tools/hvpack/ValidatedPackage.h"
+#include "tools/hvpack/Zip64Count.h"
 
 namespace HVPack {
 namespace {
@@ -148,7 +148,7 @@ void WriteArchive(const std::vector<Item>& items, const fs::path& path) {
         archive.Add(item, item.isDirectory ? std::string() : FileBytes(item));
     }
     archive.Finish();
-    if (items.size() >= kCountThatDoesNotFit && !AddWideCount(path, items.size())) {
+    if (items.size() >= HV::kCountThatDoesNotFit && !AddZip64Count(path, items.size())) {
         throw PackageError("cannot write " + path.string());
     }
 }

@@ -11,7 +11,7 @@
 #include "package/PackageNames.h"
 #include "platform/win32.h"
 #include "tools/hvpack/PackageError.h"
-#include "tools/hvpack/SoundPackage.h"
+#include "tools/hvpack/ValidatedPackage.h"
 
 namespace HVPack {
 namespace {
@@ -131,7 +131,7 @@ std::vector<fs::path> PackagesIn(const fs::path& folder) {
 }
 
 ReleaseRow RowOf(const fs::path& package) {
-    const HV::Manifest manifest = SoundPackage(package.string()).manifest;
+    const HV::Manifest manifest = ValidatedPackage(package.string()).manifest;
     const HV::FileDigests digests = HV::HeldFile(package).Digests();
     return {FileName(package),
             {DisplayName(manifest), manifest.productId, manifest.productVersion, digests.md5},

@@ -26,7 +26,7 @@ struct ReleaseRow {
 
 /// The row of one package. A package whose policy does not show it is no product of its own, and is called "None"; the
 /// others are called by the display name of their product data, or by their identifier where that is missing, as the
-/// wizard calls them. Throws what SoundPackage throws.
+/// wizard calls them. Throws what ValidatedPackage throws.
 [[nodiscard]] ReleaseRow RowOf(const fs::path& package);
 
 /// The source with `rows`, of which there is at least one, in their order. Any byte may stand in a text.

@@ -8,7 +8,7 @@
 namespace HVPack {
 
 /// What a manifest says that its author can hardly mean, though the engine takes it: a line for each, in the order of
-/// the payloads. Payloads for other systems are passed over. A package with doubts is a sound one all the same.
-[[nodiscard]] std::vector<std::string> DoubtsAbout(const HV::Manifest& manifest);
+/// the payloads. Payloads for other systems are passed over. A package with warnings is a good one all the same.
+[[nodiscard]] std::vector<std::string> WarningsAbout(const HV::Manifest& manifest);
 
 }  // namespace HVPack

@@ -6,13 +6,10 @@
 
 namespace HVPack {
 
-/// The number of entries from which on the end of an archive's directory cannot tell it.
-inline constexpr std::uint64_t kCountThatDoesNotFit = 0xFFFF;
-
-/// Adds, before the end of a finished archive, the records that hold the number of entries in a wider field.
+/// Adds, before the end of a finished archive, the Zip64 records, whose field for the number of entries is wider.
 ///
 /// The library writes them only for archives beyond 4 GB; without them other programs take the directory for damaged.
 /// The archive ends in the plain end of a directory, without a comment. False when the file cannot be changed.
-[[nodiscard]] bool AddWideCount(const fs::path& archive, std::uint64_t count);
+[[nodiscard]] bool AddZip64Count(const fs::path& archive, std::uint64_t count);
 
 }  // namespace HVPack

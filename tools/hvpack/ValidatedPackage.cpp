@@ -1,4 +1,4 @@
-#include "tools/hvpack/SoundPackage.h"
+#include "tools/hvpack/ValidatedPackage.h"
 
 #include "package/ZipEntries.h"
 #include "tools/hvpack/PackageError.h"
@@ -10,7 +10,7 @@ bool IsSound(HV::Package& package) {
     return package.Validate(false) && HV::CheckZip(package.zipPath.string()) == 0;
 }
 
-HV::Package SoundPackage(const std::string& file) {
+HV::Package ValidatedPackage(const std::string& file) {
     HV::Package package{fs::path(file)};
     if (package.zipPath.empty()) {
         throw PackageError(file + " is not named .hvpkg or .zip");

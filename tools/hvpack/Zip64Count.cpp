@@ -1,4 +1,4 @@
-#include "tools/hvpack/WideCount.h"
+#include "tools/hvpack/Zip64Count.h"
 
 #include <array>
 #include <cstdio>
@@ -29,8 +29,8 @@ std::uint64_t FourBytesAt(const End& end, std::size_t at) {
     return value;
 }
 
-/// The end of the directory with wide fields, and the record by which readers find it.
-std::string WideEnd(const End& end, std::uint64_t count, std::uint64_t position) {
+/// The Zip64 end of the directory, and the record by which readers find it.
+std::string Zip64End(const End& end, std::uint64_t count, std::uint64_t position) {
     std::string bytes;
     Append(bytes, 0x06064b50, 4);
     Append(bytes, 44, 8);  // what follows
@@ -55,13 +55,13 @@ bool InsertBeforeEnd(std::FILE* file, std::uint64_t position, std::uint64_t coun
         std::fseek(file, -static_cast<long>(end.size()), SEEK_END) != 0) {
         return false;
     }
-    const std::string bytes = WideEnd(end, count, position) + std::string(end.data(), end.size());
+    const std::string bytes = Zip64End(end, count, position) + std::string(end.data(), end.size());
     return std::fwrite(bytes.data(), 1, bytes.size(), file) == bytes.size();
 }
 
 }  // namespace
 
-bool AddWideCount(const fs::path& archive, std::uint64_t count) {
+bool AddZip64Count(const fs::path& archive, std::uint64_t count) {
     boost::system::error_code error;
     const std::uint64_t size = fs::file_size(archive, error);
     std::FILE* file = nullptr;

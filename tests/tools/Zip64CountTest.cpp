@@ -1,4 +1,4 @@
-#include "tools/hvpack/WideCount.h"
+#include "tools/hvpack/Zip64Count.h"
 
 #include <gtest/gtest.h>
 
@@ -11,7 +11,7 @@ namespace {
 const std::string kPath = R"(C:\a.zip)";
 
 /// An archive of three entries that says its number of entries does not fit.
-class WideCountTest : public testing::Test {
+class Zip64CountTest : public testing::Test {
 protected:
     void SetUp() override {
         std::string bytes =
@@ -25,12 +25,12 @@ protected:
     std::vector<std::string> directories;
 };
 
-TEST_F(WideCountTest, ADirectoryThatEndsBeforeTheCountThatDoesNotFitIsBroken) {
+TEST_F(Zip64CountTest, ADirectoryThatEndsBeforeTheCountThatDoesNotFitIsBroken) {
     EXPECT_EQ(HV::ReadZipEntries(kPath, files, directories), -1);
 }
 
-TEST_F(WideCountTest, TellsReadersTheNumberOfEntries) {
-    ASSERT_TRUE(HVPack::AddWideCount(fs::path(kPath), 3));
+TEST_F(Zip64CountTest, TellsReadersTheNumberOfEntries) {
+    ASSERT_TRUE(HVPack::AddZip64Count(fs::path(kPath), 3));
     EXPECT_EQ(HV::ReadZipEntries(kPath, files, directories), 0);
     EXPECT_EQ(files, (std::vector<std::string>{"a", "c"}));
     EXPECT_EQ(directories, std::vector<std::string>{"b/"});
@@ -38,15 +38,15 @@ TEST_F(WideCountTest, TellsReadersTheNumberOfEntries) {
     EXPECT_EQ(HV::ReadZipEntryBytes(kPath, "a", bytes), 0);
 }
 
-TEST_F(WideCountTest, ANumberBeyondTheDirectoryIsALie) {
-    ASSERT_TRUE(HVPack::AddWideCount(fs::path(kPath), 4));
+TEST_F(Zip64CountTest, ANumberBeyondTheDirectoryIsALie) {
+    ASSERT_TRUE(HVPack::AddZip64Count(fs::path(kPath), 4));
     EXPECT_EQ(HV::ReadZipEntries(kPath, files, directories), -1);
 }
 
-TEST_F(WideCountTest, FailsForWhatIsNoArchive) {
-    EXPECT_FALSE(HVPack::AddWideCount(fs::path(R"(C:\none.zip)"), 3));
+TEST_F(Zip64CountTest, FailsForWhatIsNoArchive) {
+    EXPECT_FALSE(HVPack::AddZip64Count(fs::path(R"(C:\none.zip)"), 3));
     machine.Has(R"(C:\short.zip)", "short");
-    EXPECT_FALSE(HVPack::AddWideCount(fs::path(R"(C:\short.zip)"), 3));
+    EXPECT_FALSE(HVPack::AddZip64Count(fs::path(R"(C:\short.zip)"), 3));
 }
 
 }  // namespace
