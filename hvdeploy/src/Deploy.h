@@ -17,7 +17,6 @@
 #include "hvdeploy/src/RunProgress.h"
 #include "hvdeploy/src/UninstallScripts.h"
 #include "hvframework/ProductData.h"
-#include "hvframework/TempFolder.h"
 #include "package/Package.h"
 #include "package/ValidationTable.h"
 #include "platform/filesystem.h"
@@ -123,9 +122,7 @@ private:
     // One package.
     EngineResult DeployPackage(Package& package, float progressPoints);
     EngineResult InstallValidated(Package& package, float progressPoints, std::string message);
-    EngineResult PlacePackage(Package& package, float progressPoints, const std::string& message);
-    bool Extract(Package& package);
-    void RemoveTempFiles(const Package& package);
+    EngineResult PlacePackage(const Package& package, float progressPoints, const std::string& message);
     EngineResult RollBack(EngineResult result);
     void HandOverToUninstall(const Package& package, const std::vector<std::string>& installedFiles);
     bool WriteUninstallScript(const Package& package, const std::vector<std::string>& installedFiles);
@@ -151,7 +148,6 @@ private:
     bool fatalErrorTest = false;
     std::vector<std::string> installedIdentifiers;
     std::vector<Package> deployedPackages;
-    HVL::TempFolder packageFolder;  // where the package that is being placed is unpacked
     std::vector<std::string> skipList;
     std::optional<std::set<std::string>> acceptedNames;  // all are, unless somebody has said which
     std::map<std::string, ValidationInfo> validationInfo;

@@ -1,12 +1,14 @@
 // One package, from its path to "installed".
 #include <algorithm>
 #include <iostream>
+#include <memory>
 #include <unordered_set>
 
 #include "hvdeploy/src/Deploy.h"
 #include "hvdeploy/src/EntryTrace.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
+#include "hvframework/TempFolder.h"
 
 namespace HV {
 namespace {
@@ -33,6 +35,48 @@ std::string InstallMessage(const Package& package) {
     }
     return message;
 }
+
+/// A package unpacked into a temporary folder, whose files go with the object: also when what a detector or the
+/// filesystem library throws ends the run. A package that is unpacked already is taken as it is.
+class UnpackedPackage {
+public:
+    /// On failure, which the log tells, nothing is left on the disk.
+    explicit UnpackedPackage(Package& package) : package_(package), isThere_(package.IsExtracted() || Unpack()) {}
+    ~UnpackedPackage() {
+        if (isThere_ && package_.IsExtracted()) {
+            RemoveFiles();
+        }
+    }
+    UnpackedPackage(const UnpackedPackage&) = delete;
+    UnpackedPackage& operator=(const UnpackedPackage&) = delete;
+
+    [[nodiscard]] bool IsThere() const { return isThere_; }
+
+private:
+    bool Unpack() {
+        folder_ = TempFolder("tmp");
+        const std::string path = folder_.Path();
+        if (folder_.IsThere() && package_.ExtractTo(path)) {
+            return true;
+        }
+        HVL_LOG(Error, "Failed to extract package " << package_.GetName());
+        folder_.LetGo();
+        FileUtils::DeleteFileOrDirectory(path);
+        return false;
+    }
+
+    void RemoveFiles() {
+        HVL_LOG(Debug, "Cleaning up temp files at " << package_.extractedPath);
+        folder_.LetGo();
+        if (const int error = FileUtils::DeleteFileOrDirectory(package_.extractedPath.string()); error != 0) {
+            HVL_LOG(Error, "attempt to remove temp files returned " << error);
+        }
+    }
+
+    Package& package_;
+    TempFolder folder_;
+    bool isThere_;
+};
 
 bool HasUninstallScript(const Manifest& manifest) {
     if (manifest.productId == kServiceProduct || manifest.productId == kManagerProduct) {
@@ -113,10 +157,13 @@ EngineResult Deploy::InstallValidated(Package& package, float progressPoints, st
         std::cout << message << std::endl;
     }
     ReportProgress(message.c_str(), 0);
-    if (!package.IsExtracted() && !Extract(package)) {
+    auto unpacked = std::make_unique<UnpackedPackage>(package);
+    if (!unpacked->IsThere()) {
+        // No way back: nothing of this package has reached the machine, and what earlier packages placed stays.
         return kFailed;
     }
     const EngineResult result = PlacePackage(package, progressPoints, message);
+    unpacked.reset();
     if (IsFailure(result)) {
         return RollBack(result);
     }
@@ -124,46 +171,13 @@ EngineResult Deploy::InstallValidated(Package& package, float progressPoints, st
     return result;
 }
 
-// A package that does not extract fails the run without a way back: nothing of it has reached the machine, and what
-// earlier packages placed stays.
-bool Deploy::Extract(Package& package) {
-    packageFolder = TempFolder("tmp");
-    const std::string folder = packageFolder.Path();
-    if (packageFolder.IsThere() && package.ExtractTo(folder)) {
-        return true;
-    }
-    HVL_LOG(Error, "Failed to extract package " << package.GetName());
-    packageFolder.LetGo();
-    FileUtils::DeleteFileOrDirectory(folder);
-    return false;
-}
-
-EngineResult Deploy::PlacePackage(Package& package, float progressPoints, const std::string& message) {
-    Placed placed;
-    try {
-        placed = DeployPackagePayloads(package, progressPoints, message);
-    } catch (...) {
-        // What a detector or the filesystem library throws ends the run; the temporary files must not outlive it.
-        RemoveTempFiles(package);
-        throw;
-    }
+EngineResult Deploy::PlacePackage(const Package& package, float progressPoints, const std::string& message) {
+    const Placed placed = DeployPackagePayloads(package, progressPoints, message);
     if (placed.result == kPlaced) {
         HVL_LOG(Debug, " - DeployPackagePayloads success for " << package.manifest.productId);
         HandOverToUninstall(package, placed.files);
     }
-    RemoveTempFiles(package);
     return placed.result;
-}
-
-void Deploy::RemoveTempFiles(const Package& package) {
-    if (!package.IsExtracted()) {
-        return;
-    }
-    HVL_LOG(Debug, "Cleaning up temp files at " << package.extractedPath);
-    packageFolder.LetGo();
-    if (const int error = FileUtils::DeleteFileOrDirectory(package.extractedPath.string()); error != 0) {
-        HVL_LOG(Error, "attempt to remove temp files returned " << error);
-    }
 }
 
 EngineResult Deploy::RollBack(EngineResult result) {
