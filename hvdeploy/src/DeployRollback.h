@@ -46,7 +46,6 @@ public:
     /// Whether the run was asked to talk on standard output. The front end sets it on the engine and on the stash
     /// alike; the stash has nothing to say there so far.
     void SetVerbose(bool on) { verbose = on; }
-    bool IsVerbose() const { return verbose; }
 
 private:
     /// What one payload placed, in order, with the keys by which a repeated path is recognised.

@@ -38,7 +38,7 @@ public:
     [[nodiscard]] int ParseArguments(const std::vector<std::string>& arguments);
 
     /// Reads arguments that are split already; argument 0 is the program. Returns 0, or the code of the first argument
-    /// that fails; those behind it are not looked at.
+    /// that fails; those after it are not looked at.
     [[nodiscard]] int ParseArgs(int argc, const char* const* argv);
 
     /// Reads one argument: a flag, or a key with its value. Returns 0, or -1 when it is null or not supported.
@@ -70,8 +70,6 @@ public:
     ProgressListenerInterface* Listener() const { return listener; }
     Deploy& Engine() { return deploy; }
     const std::vector<std::string>& Flags() const { return flags; }
-    bool IsVerbose() const { return verbose; }
-    bool IsTestError() const { return testError; }
     /// Whether an exception ended Run(), whose result may be 0 all the same.
     bool WasBrokenOff() const { return brokenOff; }
 

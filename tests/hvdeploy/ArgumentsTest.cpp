@@ -58,7 +58,7 @@ TEST_F(ArgumentsTest, KeepsTheLastOfARepeatedKey) {
     EXPECT_EQ(cli.GetArg("log="), "two");
 }
 
-TEST_F(ArgumentsTest, KeepsTheValueFromBehindTheFirstEqualsSignWithItsQuotes) {
+TEST_F(ArgumentsTest, KeepsTheValueAfterTheFirstEqualsSignWithItsQuotes) {
     EXPECT_EQ(cli.ParseLine("file=\"C:\\a=b c.zip\""), 0);
     EXPECT_EQ(cli.GetArg("file="), "\"C:\\a=b c.zip\"");
 }
@@ -100,8 +100,13 @@ TEST_F(ArgumentsTest, StopsAtTheFirstBadArgument) {
     EXPECT_TRUE(log.Has(DebugLine("ParseArgs() is returning false.")));
     EXPECT_TRUE(cli.CountArg("dir="));
     EXPECT_FALSE(cli.CountArg("log="));
-    EXPECT_FALSE(cli.IsVerbose());
-    EXPECT_FALSE(cli.IsTestError());
+}
+
+TEST_F(ArgumentsTest, TakesNoErrorFlagFromALineThatIsNotGoodToItsEnd) {
+    (void)Product("glow").WriteTo(R"(C:\Packages)");
+    EXPECT_EQ(cli.ParseLine(R"(dir=C:\Packages --error help=me)"), -1);
+    EXPECT_EQ(cli.Run(), 0) << log.Text();
+    EXPECT_TRUE(machine.Exists(PlaceOf("glow")));
 }
 
 TEST_F(ArgumentsTest, StopsAtANullArgument) {
@@ -109,18 +114,6 @@ TEST_F(ArgumentsTest, StopsAtANullArgument) {
     EXPECT_EQ(cli.ParseArgs(3, arguments), -1);
     EXPECT_TRUE(log.Has(ErrorLine("ParseArg() failed with error -1 for arg: ")));
     EXPECT_TRUE(cli.Flags().empty());
-}
-
-TEST_F(ArgumentsTest, TakesVerboseAndErrorFromTheFlags) {
-    EXPECT_EQ(cli.ParseLine("--verbose --error"), 0);
-    EXPECT_TRUE(cli.IsVerbose());
-    EXPECT_TRUE(cli.IsTestError());
-}
-
-TEST_F(ArgumentsTest, LeavesVerboseAndErrorOffWithoutTheFlags) {
-    EXPECT_EQ(cli.ParseLine("--about --version --legacyuninstall"), 0);
-    EXPECT_FALSE(cli.IsVerbose());
-    EXPECT_FALSE(cli.IsTestError());
 }
 
 TEST_F(ArgumentsTest, ParsesNoArgumentsAtAll) {
@@ -179,7 +172,7 @@ TEST(ErrorCodeFromText, IsZeroWhereNoNumberBegins) {
 }
 
 TEST(ErrorCodeFromText, SearchesForCharactersAndNotForTheWord) {
-    // The O stands first, and the number six characters behind it.
+    // The O stands first, and the number six characters further on.
     EXPECT_EQ(HV::ErrorCodeFromText("On the31)"), 31);
     EXPECT_EQ(HV::ErrorCodeFromText("Read: 8)"), 8);
     EXPECT_EQ(HV::ErrorCodeFromText("(12345678)"), 678);

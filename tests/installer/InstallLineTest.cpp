@@ -52,7 +52,6 @@ TEST_F(InstallLineReading, FindsEveryArgument) {
     EXPECT_EQ(cli.GetArg("skip="), R"("com.halvorn.keyer,com.halvorn.glow")");
     EXPECT_EQ(cli.GetArg("log="), R"("C:\ProgramData\Halvorn\logs\com.halvorn.tessaly-suite-1700000000-log.txt")");
     EXPECT_EQ(cli.GetArg("dir="), R"("C:\Installer\packages")");
-    EXPECT_TRUE(cli.IsVerbose());
 }
 
 TEST_F(InstallLineReading, FindsNoListWhereNothingIsSkipped) {

@@ -74,11 +74,6 @@ PackageBuilder& PackageBuilder::Version(const std::string& version) {
     return *this;
 }
 
-PackageBuilder& PackageBuilder::ShortName(const std::string& name) {
-    shortNameAttribute_ = Attribute("productshortname", name);
-    return *this;
-}
-
 PackageBuilder& PackageBuilder::DisplayName(const std::string& name) {
     return Property("display_name", name);
 }
@@ -195,11 +190,6 @@ PackageBuilder& PackageBuilder::Shortcut(const std::string& original, const std:
                                        "</original></shortcut>");
 }
 
-PackageBuilder& PackageBuilder::PayloadXml(const std::string& xml) {
-    Current().xml += xml;
-    return *this;
-}
-
 void PackageBuilder::AddFoldersOf(const std::string& path) {
     for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1)) {
         Folder(path.substr(0, end));
@@ -259,7 +249,7 @@ std::string PackageBuilder::PayloadText(const PayloadParts& payload) {
     }
     return "    <payload" + Attribute("id", payload.id) + Attribute("type", payload.type) +
            AttributeIfAny("os", payload.os) + AttributeIfAny("deployment", payload.deployment) + ">" + inside +
-           payload.xml + "</payload>\n";
+           "</payload>\n";
 }
 
 std::string PackageBuilder::Manifest() const {
@@ -271,9 +261,9 @@ std::string PackageBuilder::Manifest() const {
         contents += PayloadText(payload);
     }
     return "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<hvmanifest version=\"1.0\"" +
-           Attribute("product", productId_) + Attribute("productversion", version_) + shortNameAttribute_ + ">\n" +
-           "  <installer-policy" + policyAttributes_ + "/>\n  <product-data>" + properties_ + "</product-data>\n" +
-           "  <contents>\n" + contents + "  </contents>\n</hvmanifest>\n";
+           Attribute("product", productId_) + Attribute("productversion", version_) + ">\n" + "  <installer-policy" +
+           policyAttributes_ + "/>\n  <product-data>" + properties_ + "</product-data>\n" + "  <contents>\n" +
+           contents + "  </contents>\n</hvmanifest>\n";
 }
 
 std::string PackageBuilder::Bytes() const {

@@ -22,7 +22,6 @@ public:
 
     // The product
     PackageBuilder& Version(const std::string& version);
-    PackageBuilder& ShortName(const std::string& name);
     PackageBuilder& DisplayName(const std::string& name);  // product property "display_name"
     PackageBuilder& Property(const std::string& key, const std::string& value);
     PackageBuilder& Policy(const std::string& attribute, const std::string& value);
@@ -51,8 +50,6 @@ public:
                                   const std::string& value, const std::string& os = "");
     PackageBuilder& Shortcut(const std::string& original, const std::string& originalType, const std::string& sysdir,
                              const std::string& subdir = "", bool failOnError = false);
-    /// Any elements, as they stand, inside the payload.
-    PackageBuilder& PayloadXml(const std::string& xml);
 
     // The archive
     PackageBuilder& File(const std::string& path, const std::string& bytes);
@@ -87,7 +84,6 @@ private:
         std::string subpath;
         std::string sysdir;
         std::map<std::string, std::string> groups;  // the elements inside "hosts", "dependencies" and so on
-        std::string xml;
     };
 
     PayloadParts& Current();
@@ -98,7 +94,6 @@ private:
     std::string productId_;
     std::string version_ = "1.0";
     std::string fileName_;
-    std::string shortNameAttribute_;
     std::string policyAttributes_;
     std::string properties_;
     std::vector<PayloadParts> payloads_;
