@@ -79,7 +79,7 @@ std::string KnownAfterEffectsFolder(const std::string& version) {
     return "";
 }
 
-/// The application's folder, with the separator behind it. A value that is there but empty is an answer too.
+/// The application's folder, with a separator at its end. A value that is there but empty is an answer too.
 std::string AfterEffectsFolder(const Win32RegKeyHandle& key, const std::string& version) {
     std::string folder;
     const bool isRead = key.ReadValue("", "InstallPath", folder) != -1;

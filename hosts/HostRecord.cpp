@@ -34,8 +34,8 @@ HostType HostTypeFromAbbreviation(const std::string& abbreviation) {
     return HostType::NotSet;
 }
 
-// Readers of the listing know this text: no value is escaped, so a Windows path shows single backslashes and the text
-// is JSON in shape only.
+// Fixed (contracts, hosts): no value is escaped, so a Windows path shows single backslashes and the text is JSON in
+// shape only.
 std::string HostRecord::ToText() const {
     const std::array<std::pair<const char*, const std::string&>, 10> fields{{
         {"hostAbbreviation", hostAbbreviation},
@@ -55,7 +55,7 @@ std::string HostRecord::ToText() const {
             text += "\n  \"" + std::string(key) + "\": \"" + value + "\",";
         }
     }
-    // The comma behind the last value is always the last of the text, whatever the values hold.
+    // The comma after the last value is always the last of the text, whatever the values hold.
     if (const auto lastComma = text.rfind(','); lastComma != std::string::npos) {
         text[lastComma] = '\n';
     }

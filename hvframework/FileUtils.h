@@ -39,7 +39,7 @@ namespace HVL::FileUtils {
 /// `path` without its final `\` or `/`; at most one is removed.
 [[nodiscard]] std::string StripTrailingSeparator(std::string_view path);
 
-/// The last component: what stands behind the last `\`, or before it when it is the final character
+/// The last component: what stands after the last `\`, or before it when it is the final character
 /// (`C:\a\b\` gives `b`). Without a `\` it is the whole text.
 [[nodiscard]] std::string GetFileName(std::string_view path);
 
@@ -56,12 +56,12 @@ namespace HVL::FileUtils {
 
 // Making and finding names
 
-/// A new path in `directory` that nothing else bears: `prefix`, cut to 30 bytes at most (never inside a character),
+/// A new path in `directory` that nothing else has: `prefix`, cut to 30 bytes at most (never inside a character),
 /// and a random identifier. Nothing is made on disk.
 [[nodiscard]] std::string MakeTempPath(std::string_view prefix, std::string_view directory);
 
-/// Searches for a free name near `path` and tells whether a counter of up to 131,072 sufficed. The search probes and
-/// leaves nothing behind; the name that it found is not told.
+/// Searches for a free name near `path` and tells whether a counter of up to 131,072 sufficed. The search only
+/// looks, and makes nothing; the name that it found is not told.
 bool GetUniqueFileName(const std::string& path);
 
 /// The same search over names that `exists` knows.

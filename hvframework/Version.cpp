@@ -56,7 +56,7 @@ void Version::GetParts(std::int32_t& major, std::int32_t& minor, std::int32_t& p
     }
 }
 
-// The patch stands behind the last dot here, wherever that is, and not behind the second as in GetParts: hosts are
+// The patch stands after the last dot here, wherever that is, and not after the second as in GetParts: hosts are
 // shown and compared by these three numbers, so making the two agree would change which versions of a host are found.
 void Version::GetShortParts(std::int32_t& major, std::int32_t& minor, std::int32_t& patch) const {
     major = NumberAt(text, 0);

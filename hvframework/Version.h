@@ -29,7 +29,7 @@ public:
     /// The four numbers between the first three dots; a missing one is 0.
     void GetParts(std::int32_t& major, std::int32_t& minor, std::int32_t& patch, std::int32_t& build) const;
 
-    /// Three numbers for showing and comparing host versions: before the first dot, behind the first, behind the last.
+    /// Three numbers for showing and comparing host versions: before the first dot, after the first, after the last.
     /// So the third number of `1.2.3.4` is 4 here and 3 in GetParts.
     void GetShortParts(std::int32_t& major, std::int32_t& minor, std::int32_t& patch) const;
 

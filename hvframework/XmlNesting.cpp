@@ -27,7 +27,7 @@ bool ContinuesName(char c) {
 ///
 /// Each step returns false where the library gives up; what it has taken by then has been counted. The steps follow
 /// the library's, oddities included, because a difference would let a text hide its depth: a character that swallows
-/// the `<` behind it, a quote behind a byte order mark, a `>` inside a value.
+/// the `<` that follows, a quote after a byte order mark, a `>` inside a value.
 class NestingScan {
 public:
     NestingScan(const char* text, Reading reading) : p_(text), reading_(reading) {}

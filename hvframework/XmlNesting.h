@@ -5,7 +5,7 @@
 
 namespace HVL {
 
-/// What the XML library would have to bear if it read a text.
+/// What the XML library would have to cope with if it read a text.
 struct XmlShape {
     /// Elements within elements; the library reads, copies and frees them by recursion.
     std::size_t deepest = 0;

@@ -56,9 +56,8 @@ bool PayloadSources::Has(const std::string& source) const {
     std::string wanted = recursive ? source.substr(0, source.size() - 1) : source;
     const bool wild = wanted.find('*') != std::string::npos;
     wanted = WithSlashes(StripTrailingSeparator(wanted));
-    // Folders are matched against the source with its backslashes, which no entry here has, and files against the one
-    // with slashes. So a wildcard below a folder finds files alone: packages are built to that, and one that passes
-    // only by its folders would place nothing.
+    // Fixed (contracts, archive): folders are matched against the source with its backslashes, which no entry here has,
+    // and files against the one with slashes. So a wildcard below a folder finds files alone.
     const std::string whole = StripTrailingSeparator(source);
     if (HasName(directories_, wanted) || ((recursive || wild) && HasMatch(directories_, whole))) {
         return true;

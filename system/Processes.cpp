@@ -39,7 +39,7 @@ std::string FileNameOf(const std::string& path) {
     return separator == std::string::npos ? std::string() : path.substr(separator + 1);
 }
 
-/// The first four bytes of what the system says of the user behind the process, or 0.
+/// The first four bytes of what the system says of the user who runs the process, or 0.
 std::uint32_t OwnerTagOf(HANDLE process) {
     HANDLE token = nullptr;
     if (!OpenProcessToken(process, TOKEN_READ, &token)) {

@@ -39,8 +39,8 @@ enum class SysDir {
 [[nodiscard]] SysDir SysDirFromKeyword(const std::string& keyword);
 
 /// The path of `directory`; empty for AbsolutePath, for Unknown, for a value outside the enumeration, and where the
-/// environment variable behind it is not set. ProgramData, ProgramFiles and ProgramFiles32 are read from the
-/// environment once in the process's life; all others that depend on it are read at each call.
+/// environment variable that it is taken from is not set. ProgramData, ProgramFiles and ProgramFiles32 are read from
+/// the environment once in the process's life; all others that depend on it are read at each call.
 [[nodiscard]] fs::path GetSystemDirectory(SysDir directory);
 
 /// Where an application goes whose manifest names no directory: that of ProgramFiles.

@@ -7,7 +7,7 @@
 namespace HV {
 namespace {
 
-// The thread's own road. A failing run has told the listener by itself already and is told again here, with the same
+// What the thread does. A failing run has told the listener by itself already and is told again here, with the same
 // words: a line that does not parse is told here alone.
 void RunLine(DeployCLI* cli, std::string line) {
     int code = cli->ParseLine(std::move(line));
@@ -20,9 +20,9 @@ void RunLine(DeployCLI* cli, std::string line) {
 }
 
 // Threads outlive their jobs, so the process keeps them and not the job.
-boost::thread* StartThread(const boost::function<void()>& road) {
+boost::thread* StartThread(const boost::function<void()>& work) {
     static auto& threads = *new std::deque<std::unique_ptr<boost::thread>>();
-    threads.push_back(std::make_unique<boost::thread>(road));
+    threads.push_back(std::make_unique<boost::thread>(work));
     return threads.back().get();
 }
 

@@ -6,7 +6,7 @@
 namespace HV {
 
 /// The line that a process's arguments make: joined by single blanks, and an argument in double quotes again, from
-/// behind its first "=" (or as a whole when it has none), where the line would take it apart otherwise. One that holds
+/// after its first "=" (or as a whole when it has none), where the line would take it apart otherwise. One that holds
 /// a double quote is somebody's own quoting and stays as it is.
 std::string LineFromArguments(const std::vector<std::string>& arguments);
 

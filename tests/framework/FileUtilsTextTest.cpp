@@ -174,7 +174,7 @@ bool IsNamed(const std::string& path, const std::string& begin) {
     return path.starts_with(begin) && IsIdentifier(path.substr(begin.size()));
 }
 
-TEST(MakeTempPath, PutsARandomIdentifierBehindThePrefix) {
+TEST(MakeTempPath, PutsARandomIdentifierAfterThePrefix) {
     EXPECT_PRED2(IsNamed, MakeTempPath("tmp", R"(C:\Temp)"), R"(C:\Temp\tmp)");
     EXPECT_PRED2(IsNamed, MakeTempPath("", R"(C:\)"), R"(C:\)");
 }
@@ -189,7 +189,7 @@ TEST(MakeTempPath, CutsNoCharacterInTwo) {
     EXPECT_PRED2(IsNamed, MakeTempPath(prefix, "d"), R"(d\12345678901234567890123456789)");
 }
 
-TEST(MakeTempPath, KeepsNothingBehindItsOwnMark) {
+TEST(MakeTempPath, KeepsNothingAfterItsOwnMark) {
     EXPECT_PRED2(IsNamed, MakeTempPath("a-tmpXb", "d"), R"(d\a)");
     EXPECT_PRED2(IsNamed, MakeTempPath("a-tmpx", "d"), R"(d\a-tmpx)");
 }
@@ -235,7 +235,7 @@ TEST_F(UniqueName, CountsBeforeTheExtension) {
     EXPECT_THAT(candidates, ElementsAre(R"(C:\a\un.x.bat)", R"(C:\a\un.x-1.bat)", R"(C:\a\un.x-2.bat)"));
 }
 
-TEST_F(UniqueName, CountsBehindAPathWithoutAnExtension) {
+TEST_F(UniqueName, CountsAfterAPathWithoutAnExtension) {
     EXPECT_TRUE(Search(R"(C:\a.b\un)", 2));
     EXPECT_THAT(candidates, ElementsAre(R"(C:\a.b\un)", R"(C:\a.b\un-1)", R"(C:\a.b\un-2)"));
 }

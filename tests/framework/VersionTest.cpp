@@ -48,7 +48,7 @@ TEST(Version, TreatsMissingNumbersAsZero) {
     EXPECT_EQ(PartsOf(".1..3"), (Parts{0, 1, 0, 3}));
 }
 
-TEST(Version, IgnoresWhatStandsBehindTheFourthNumber) {
+TEST(Version, IgnoresWhatStandsAfterTheFourthNumber) {
     EXPECT_EQ(PartsOf("1.2.3.4.5"), (Parts{1, 2, 3, 4}));
 }
 
@@ -93,7 +93,7 @@ TEST(Version, IsEqualWhenAllFourNumbersAre) {
     EXPECT_FALSE(Equal("10.0.0.1", "10.0.0"));
 }
 
-TEST(Version, DoesNotCountTheTextBehindANumber) {
+TEST(Version, DoesNotCountTheTextAfterANumber) {
     const Version first("2.0-d1");
     const Version second("2.0-d2");
     EXPECT_TRUE(first.IsEqual(second));

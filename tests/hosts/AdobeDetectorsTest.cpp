@@ -206,7 +206,7 @@ TEST_F(AdobeAEDetector, CountsAVersionWithoutPresets) {
     EXPECT_EQ(hosts.front().hostPresetsPath, "");
 }
 
-TEST_F(AdobeAEDetector, PutsNoSeparatorBehindAFolderThatComesWithoutOne) {
+TEST_F(AdobeAEDetector, PutsNoSeparatorAfterAFolderThatComesWithoutOne) {
     HasKey(KeyOf("22.0"), {{"InstallPath", R"(C:\Adobe\After Effects)"},
                            {"PluginInstallPath", R"(C:\Plug-ins\)"},
                            {"CommonPluginInstallPath", kMediaCore}});

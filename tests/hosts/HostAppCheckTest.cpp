@@ -102,7 +102,7 @@ TEST_F(HostAppCheckTest, LeavesOutWhatADetectorFoundThatAnswersFalse) {
     EXPECT_EQ(VersionsOf("vegas"), Texts{"14"});
 }
 
-TEST_F(HostAppCheckTest, GoesOnBehindADetectorThatFindsNothing) {
+TEST_F(HostAppCheckTest, GoesOnAfterADetectorThatFindsNothing) {
     Finds({}, false);
     const auto second = Finds({Vegas("14")});
     EXPECT_TRUE(check.DetectHosts());

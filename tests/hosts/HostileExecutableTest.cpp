@@ -63,7 +63,7 @@ protected:
     }
     /// The description of the resource's data: its address and its size.
     std::size_t Description() const { return Resources() + Number(image, Entry(2) + 4, 4); }
-    /// The name of the block, three 16-bit numbers behind its beginning.
+    /// The name of the block, three 16-bit numbers after its beginning.
     std::size_t Block() const { return image.find(std::string("V\0S\0_\0V\0", 8)) - 6; }
 
     std::size_t HeadersEnd() const {

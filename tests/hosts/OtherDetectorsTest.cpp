@@ -215,7 +215,7 @@ TEST_F(HitFilmDetector, CountsAProductThatDoesNotSayWhereItIs) {
     EXPECT_EQ(hosts.front().hostPluginPath, kOfxFolder);
 }
 
-TEST_F(HitFilmDetector, PutsNoSeparatorBehindAFolderThatComesWithoutOne) {
+TEST_F(HitFilmDetector, PutsNoSeparatorAfterAFolderThatComesWithoutOne) {
     HasKey("FXHOME\\HitFilm Pro\\Paths", {{"Application", R"(C:\FXHOME\HitFilm Pro)"}});
     EXPECT_TRUE(Run());
     ASSERT_EQ(hosts.size(), 1U);

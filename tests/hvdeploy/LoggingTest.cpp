@@ -224,7 +224,7 @@ TEST_F(LoggingTest, LooksAtEveryArgumentFromTheFirstOnAndTakesTheLastLevel) {
     EXPECT_EQ(HVL::Log::Detail().getPriority(), static_cast<int>(Priority::WARN));
 }
 
-TEST_F(LoggingTest, GoesOnBehindAnUnknownLevel) {
+TEST_F(LoggingTest, GoesOnAfterAnUnknownLevel) {
     CapturedStreams streams;
     EXPECT_EQ(SetLevel({"loglevel=loud", "loglevel=crit"}), 1);
     EXPECT_EQ(HVL::Log::Detail().getPriority(), static_cast<int>(Priority::CRIT));

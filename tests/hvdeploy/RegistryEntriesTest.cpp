@@ -51,7 +51,7 @@ TEST_F(RegistryEntriesTest, AreStoredAsExpandableText) {
     EXPECT_EQ(log.Lines(), std::vector<std::string>{DebugLine("HV::Deploy::HV::Deploy::MakeRegistryEntry")});
 }
 
-// Asked of the registry's text, because reading a value puts a terminator behind it that may not be stored.
+// Asked of the registry's text, because reading a value puts a terminator after it that may not be stored.
 TEST_F(RegistryEntriesTest, AreStoredWithTheirTerminator) {
     entry.value = "ab";
     EXPECT_EQ(engine.MakeRegistryEntry(entry), 0);

@@ -247,7 +247,7 @@ TEST_F(RunTest, ListsInPlaceOfDeploying) {
     EXPECT_FALSE(log.Has(DebugLine("HV::DeployCLI::HV::DeployCLI::DoDeployCommand")));
 }
 
-TEST_F(RunTest, DoesNothingForTheKeysThatOlderCallersPass) {
+TEST_F(RunTest, AcceptsFourKeysThatDoNothing) {
     (void)Product("glow").WriteTo(R"(C:\Packages)");
     EXPECT_EQ(Run(R"(rollback=force manifest=x uninstall=y update=newer dir=C:\Packages)"), 0);
     EXPECT_TRUE(machine.HasFile(PlaceOf("glow")));

@@ -120,14 +120,14 @@ TEST_F(ScriptsTest, ReadTheCodeDividedBy256) {
     EXPECT_EQ(log.Lines().back(), ErrorLine("script returned 1"));
 }
 
-TEST_F(ScriptsTest, DoNotRunTheCommandBehindAFailedScript) {
+TEST_F(ScriptsTest, DoNotRunTheCommandAfterAFailedScript) {
     HasScript("exit 512\n");
     script.command = "echo hello";
     EXPECT_EQ(Run(), -2);
     EXPECT_TRUE(log.LinesStartingWith(DebugLine("Running postflight command")).empty());
 }
 
-TEST_F(ScriptsTest, GoOnToTheCommandBehindAScriptThatMayFail) {
+TEST_F(ScriptsTest, GoOnToTheCommandAfterAScriptThatMayFail) {
     HasScript("exit 512\n");
     script.command = "echo hello";
     script.failOnError = false;
@@ -149,7 +149,7 @@ TEST_F(ScriptsTest, FailWithTheirCommand) {
     EXPECT_EQ(log.Lines().back(), ErrorLine("command returned 2"));
 }
 
-TEST_F(ScriptsTest, FailWithTheCommandBehindAScriptThatSucceeded) {
+TEST_F(ScriptsTest, FailWithTheCommandAfterAScriptThatSucceeded) {
     HasScript("echo hello\n");
     script.command = "exit 512";
     EXPECT_EQ(Run(), -2);

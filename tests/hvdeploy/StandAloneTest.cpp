@@ -23,7 +23,7 @@ TEST(LineFromArguments, JoinsByABlank) {
     EXPECT_EQ(LineFromArguments({"--verbose", "dir=a", "log=b"}), "--verbose dir=a log=b");
 }
 
-TEST(LineFromArguments, QuotesAValueWithWhiteSpaceFromBehindItsFirstEqualsSign) {
+TEST(LineFromArguments, QuotesAValueWithWhiteSpaceAfterItsFirstEqualsSign) {
     EXPECT_EQ(LineFromArguments({R"(dir=C:\a b=c d)", "--about"}), R"(dir="C:\a b=c d" --about)");
 }
 
@@ -289,7 +289,7 @@ TEST_F(ProgressBarTest, FillsItsCellsWithThePercentage) {
     EXPECT_EQ(Picture(), (Lines{"[########################] 100% c"}));
 }
 
-TEST_F(ProgressBarTest, LeavesNothingOfALongerMessageBehind) {
+TEST_F(ProgressBarTest, LeavesNothingOfALongerMessage) {
     bar->update(1, "a rather long message", 0);
     bar->update(1, "short", 0);
     EXPECT_EQ(Picture(), (Lines{"[........................]   1% short"}));

@@ -72,7 +72,7 @@ TEST_F(UninstallHandOverTest, EntersTheSuiteInTheListOfInstalledPrograms) {
         << registry;
 }
 
-TEST_F(UninstallHandOverTest, LeavesNoEntryBehindAFailedRun) {
+TEST_F(UninstallHandOverTest, LeavesNoEntryAfterAFailedRun) {
     machine.Has(R"(C:\Packages\suite.json)", kTessalyFile);
     (void)Glow().Postflight("exit 512").WriteTo(kFolder);
     const std::string before = machine.Registry();

@@ -8,7 +8,7 @@
 
 inline constexpr const char* kScriptPath = R"(C:\ProgramData\Halvorn\uninstall\uninstall-com.halvorn.tessaly_v3.1.bat)";
 
-/// The header, the line end behind it and an empty line.
+/// The header, the line end after it and an empty line.
 inline const std::string kHeaderOnDisk =
     "@echo off\rSET SCRIPT_NAME%0\rSET SCRIPT_DIR=%~dp0\rSET SCRIPT_PATH=%SCRIPT_DIR%%SCRIPT_NAME%\r\r\n\r\n";
 

@@ -7,8 +7,8 @@
 //   Can't recognize 'ET SCRIPT_NAMEC:\ProgramData\Halvorn\uninstall\uninstall-com.halvorn.tessaly-suite_v4.2.0.bat'
 //   Can't recognize 'ET SCRIPT_DIR=C:\ProgramData\Halvorn\uninstall\'
 //   Can't recognize 'ET SCRIPT_PATH='
-// each with "as an internal or external command, or batch script." behind it: %0 and %~dp0 are expanded, and the two
-// variables of the last line are not set. The last return takes the one of the line end behind it. The rest is run as
+// each with "as an internal or external command, or batch script." after it: %0 and %~dp0 are expanded, and the two
+// variables of the last line are not set. The last return takes the one of the line end after it. The rest is run as
 // it stands, since nothing in it asks for those variables. `reg` says on standard output that it cannot find the key
 // for every package but the first, and the last of those is the exit status, 1. These are facts about that interpreter
 // and not asked of any other; the tests ask what is left in the end.
@@ -26,7 +26,7 @@ struct Said {
     std::string errors;
 };
 
-/// The sample release installed and removed once, with what stood there before, between and behind.
+/// The sample release installed and removed once, with what stood there before, between and after.
 class SampleRemovalTest : public testing::Test {
 protected:
     using Files = SampleInstallation::Files;

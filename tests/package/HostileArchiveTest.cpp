@@ -175,7 +175,7 @@ TEST_F(HostileArchiveTest, AnEntryWithAWrongChecksumFailsToBeWritten) {
 TEST_F(HostileArchiveTest, AnEntryWhosePackedBytesAreGarbageFailsToBeWritten) {
     machine.Has(kPath, ArchiveBuilder().Add({.name = "bad", .bytes = std::string(2000, 'a')}).Bytes());
     std::string bytes = machine.Content(kPath);
-    bytes[30 + 3] = '\xFF';  // the first byte behind the entry's header and name
+    bytes[30 + 3] = '\xFF';  // the first byte after the entry's header and name
     machine.Has(kPath, bytes);
     EXPECT_EQ(HV::ExtractZip(kPath, kOut), -1);
     EXPECT_TRUE(log.Has(WriteError("bad")));

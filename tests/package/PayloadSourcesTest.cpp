@@ -89,7 +89,7 @@ TEST(PayloadSources, WildcardsWithASeparatorFindNoDirectory) {
     EXPECT_TRUE(sources.Has(R"(plugins\Glow.bundle)"));
 }
 
-TEST(PayloadSources, ATrailingStarBehindADirectoryIsThatDirectory) {
+TEST(PayloadSources, ATrailingStarAfterADirectoryIsThatDirectory) {
     EXPECT_TRUE(HV::PayloadSources({"plugins/sub/"}, {}).Has(R"(plugins\sub\*)"));
 }
 

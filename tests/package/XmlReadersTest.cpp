@@ -61,7 +61,7 @@ TEST(XmlReaders, ChildTextIsThatOfTheFirstChildOfTheName) {
     EXPECT_EQ(out, "first");
 }
 
-TEST(XmlReaders, TextStandsBehindCommentsAndOtherElements) {
+TEST(XmlReaders, TextStandsAfterCommentsAndOtherElements) {
     const Parsed xml("<a><t><!-- why -->what</t><u><b/>later</u></a>");
     std::string out;
     EXPECT_TRUE(HV::GetChildText(xml.Root(), "t", out));

@@ -129,7 +129,7 @@ TEST_F(ZipEntriesTest, BytesThatDoNotMatchTheirChecksumAreNotRead) {
     EXPECT_EQ(Read("bad"), -1);
 }
 
-TEST_F(ZipEntriesTest, AnArchiveBehindAnotherFilesBytesOpens) {
+TEST_F(ZipEntriesTest, AnArchiveAfterAnotherFilesBytesOpens) {
     Archive({{.name = "a", .bytes = "x"}});
     machine.Has(kPath, "a program that unpacks itself" + machine.Content(kPath));
     EXPECT_EQ(List(), 0);

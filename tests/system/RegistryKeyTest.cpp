@@ -384,12 +384,12 @@ TEST_F(PathParsing, WorksWithoutTheLeadingComputer) {
     EXPECT_EQ(path, "SOFTWARE");
 }
 
-TEST_F(PathParsing, GivesAnEmptyPathBehindALastSeparator) {
+TEST_F(PathParsing, GivesAnEmptyPathAfterALastSeparator) {
     EXPECT_TRUE(Win32RegKeyHandle::ParseRegistryPath(R"(HKEY_USERS\)", hive, path));
     EXPECT_EQ(path, "");
 }
 
-TEST_F(PathParsing, FailsWithoutASeparatorBehindTheHive) {
+TEST_F(PathParsing, FailsWithoutASeparatorAfterTheHive) {
     EXPECT_FALSE(Win32RegKeyHandle::ParseRegistryPath("HKEY_LOCAL_MACHINE", hive, path));
     EXPECT_FALSE(Win32RegKeyHandle::ParseRegistryPath(R"(Computer\HKEY_LOCAL_MACHINE)", hive, path));
     EXPECT_FALSE(Win32RegKeyHandle::ParseRegistryPath("", hive, path));

@@ -90,7 +90,7 @@ TEST_F(SystemDirectories, FollowTheEnvironmentAtEachCall) {
     EXPECT_EQ(variables, 10);
 }
 
-TEST_F(SystemDirectories, PutNoSecondSeparatorBehindAVariableThatEndsInOne) {
+TEST_F(SystemDirectories, PutNoSecondSeparatorAfterAVariableThatEndsInOne) {
     SetEnvironmentVariableA("AppData", R"(D:\)");
     EXPECT_EQ(DirectoryOf("userlogs"), R"(D:\Halvorn\logs)");
 }

@@ -190,7 +190,7 @@ TEST_F(StringsTest, KnowsAnEmptyText) {
     EXPECT_EQ(Get(""), "c");
 }
 
-TEST_F(StringsTest, TakesNoTextFromBehindACommentOrAnElement) {
+TEST_F(StringsTest, TakesNoTextAfterACommentOrAnElement) {
     ASSERT_TRUE(Parse(Table(R"(<string key="a"><!-- first -->one</string><string key="b"><b/>two</string>)")));
     EXPECT_EQ(Get("a"), "");
     EXPECT_EQ(Get("b"), "");

@@ -68,7 +68,7 @@ TEST_F(EnginePackageTest, LooksAtEveryInstalledVersion) {
 TEST_F(EnginePackageTest, LooksAtItsOwnProductAlone) {
     EXPECT_TRUE(Installs("2.0", {"com.halvorn.glowing_v9.0"}));
 }
-TEST_F(EnginePackageTest, ReadsAVersionBehindTheFirstMark) {
+TEST_F(EnginePackageTest, ReadsAVersionAfterTheFirstMark) {
     EXPECT_FALSE(Installs("2.0", {"com.halvorn.glow_v3.0_v1.0"}));
 }
 // Without a version the whole stem is read as one; "com" is no number, and counts as 0.
@@ -225,7 +225,7 @@ TEST_F(EnginePackageTest, FinishesAPackageWithNothingForThisSystem) {
     EXPECT_EQ(log.LinesStartingWith(DebugLine("Writing standalone")).size(), 0U);
 }
 
-TEST_F(EnginePackageTest, LogsItsRoad) {
+TEST_F(EnginePackageTest, LogsEachOfItsSteps) {
     EXPECT_EQ(Install({Placing("glow").DisplayName("Tessaly Glow")}), 1);
     const std::vector<std::string> expected{
         DebugLine(R"(packagePath: "C:\Packages\com.halvorn.glow.hvpkg")"),

@@ -44,7 +44,7 @@ TEST_F(FlowTest, ReportsEveryStepOfAFullRunWithItsPercentage) {
     Ships(TwoPayloads("postflight-glow.hvpkg"));
     EXPECT_EQ(InstallFolder(), 1) << log.Text();
     // Three files of one size: 30 points each, a quarter of one for the first report, 14.875 for each payload. Adding
-    // stops at 97, so the packages behind the 98 go back to it.
+    // stops at 97, so the packages after the 98 go back to it.
     EXPECT_EQ(listener.reports, (Texts{"1 Preparing to install...",
                                        "2 Checking packages to install...",
                                        "2 Installing packages...",

@@ -51,7 +51,7 @@ TEST_F(StrangersLinkTest, FailsAPayloadThatWouldGoThroughIt) {
     EXPECT_TRUE(HasRolledBack());
 }
 
-TEST_F(StrangersLinkTest, FailsAPayloadWhoseFolderWouldBeMadeBehindIt) {
+TEST_F(StrangersLinkTest, FailsAPayloadWhoseFolderWouldBeMadeThroughIt) {
     machine.HasFolder(kVictim);
     Link(kShared, kVictim);
     ByStranger(kShared);

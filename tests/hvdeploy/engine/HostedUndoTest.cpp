@@ -132,7 +132,7 @@ TEST_F(HostedUndoTest, ABreakOnTheWayBackCostsNoMoreThanItsOwnItem) {
         if (kKinds[kind] != Operation::Rename && kKinds[kind] != Operation::Delete) {
             continue;  // a way back moves and deletes, and neither writes nor makes anything
         }
-        // Both runs go the same road up to the way back; moves are then those of the stash alone.
+        // Both runs do the same up to the way back; moves are then those of the stash alone.
         const std::uint64_t first = kKinds[kind] == Operation::Rename ? forward.ofKind[kind] + 1 : 1;
         for (std::uint64_t n = first; n <= both.ofKind[kind]; ++n) {
             SCOPED_TRACE(std::string(kNames[kind]) + " " + std::to_string(n));

@@ -62,7 +62,7 @@ TEST_F(PayloadWalkTest, ForcesForAKeyThatIsThere) {
 TEST_F(PayloadWalkTest, LetsForceWinBeforeSkip) {
     EXPECT_EQ(Decide({File(force, kThere), File(skip, kThere)}), 1);
 }
-TEST_F(PayloadWalkTest, LetsForceWinBehindSkip) {
+TEST_F(PayloadWalkTest, LetsForceWinAfterSkip) {
     EXPECT_EQ(Decide({File(skip, kThere), File(force, kThere)}), 1);
 }
 TEST_F(PayloadWalkTest, KeepsSkipWhenALaterForceDoesNotHold) {
@@ -142,7 +142,7 @@ TEST_F(PayloadWalkTest, AFailedPayloadEndsTheWalkAndGoesBack) {
     EXPECT_FALSE(log.Has(DebugLine("HV::Deploy::DeployPayload payload-3 fromPackage com.halvorn.glow.hvpkg")));
 }
 
-TEST_F(PayloadWalkTest, ACancelIsSeenBehindThePayload) {
+TEST_F(PayloadWalkTest, ACancelIsSeenAfterThePayload) {
     machine.Has(Placed("glow"), "old");
     listener.onReport = [this](std::size_t) {
         if (listener.reports.back() == "1 Installing com.halvorn.glow.hvpkg...") {

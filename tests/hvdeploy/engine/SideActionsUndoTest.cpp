@@ -1,7 +1,7 @@
 // A run with scripts, registry entries and shortcuts goes back: the files are as before, and what else was done stays.
 //
 // That is the rule and no gap: nothing records what a script did, an entry's older value is not kept, and a shortcut is
-// known to the removal script alone, which stays behind as well.
+// known to the removal script alone, which stays as well.
 #include "tests/hvdeploy/engine/SideActionsScenario.h"
 
 TEST_F(SideActionsUndoTest, DoesEverythingWhenNothingIsInTheWay) {
@@ -42,7 +42,7 @@ TEST_F(SideActionsUndoTest, PutsFilesBackAndLeavesAllElseWhenTheLastPackageFails
     EXPECT_EQ(SectionsLeftAndSaid(machine, outcome), (std::pair<std::size_t, std::size_t>{2, 2}));
 }
 
-// Every place where the engine looks at the switch lies behind a report of its own: the first report of a phase comes
+// Every place where the engine looks at the switch comes after a report of its own: the first report of a phase comes
 // before its first package, and each payload's before the question that follows it.
 TEST_F(SideActionsUndoTest, PutsFilesBackAndLeavesAllElseAfterACancelAtEveryReport) {
     const auto [before, files] = [] {
