@@ -7,10 +7,10 @@
 #include "hvframework/FileUtils.h"
 #include "installer/InstallLine.h"
 #include "installer/InstallerModel.h"
-#include "installer/SharedDirectory.h"
 #include "installer/WinWizardController.h"
 #include "installer/WizardBoxes.h"
 #include "platform/command_processor.h"
+#include "platform/shared_directory.h"
 #include "system/SystemDirectories.h"
 
 namespace HV {
@@ -30,7 +30,7 @@ DeployJob* KeptJob(std::string commandLine) {
 
 std::string SharedSubdirectory(const std::string& directory, const char* name) {
     std::string path = HVL::FileUtils::JoinPath(directory, name);
-    CreateSharedDirectory(path);
+    platform::CreateSharedDirectory(path);
     return path;
 }
 

@@ -8,7 +8,6 @@
 #ifdef _WIN32
 #include "platform/windows/win32.h"
 #else
-#include "platform/hosted/access_control.h"
 #include "platform/hosted/command.h"
 #include "platform/hosted/console.h"
 #include "platform/hosted/processes.h"

@@ -2,8 +2,8 @@
 #include <algorithm>
 #include <ctime>
 
-#include "tests/installer/FolderAccess.h"
 #include "tests/installer/WizardTest.h"
+#include "tests/support/FolderAccess.h"
 
 namespace {
 

@@ -6,7 +6,7 @@
 
 #include "platform/utf8.h"
 #include "platform/win32.h"
-#include "tests/installer/FolderAccess.h"
+#include "tests/support/FolderAccess.h"
 #include "tests/support/ScratchFile.h"
 
 namespace {

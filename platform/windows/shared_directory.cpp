@@ -1,11 +1,11 @@
-#include "installer/SharedDirectory.h"
+#include "platform/shared_directory.h"
 
 #include <memory>
 
-#include "platform/filesystem.h"
-#include "platform/win32.h"
+#include "platform/windows/filesystem.h"
+#include "platform/windows/win32.h"
 
-namespace HV {
+namespace platform {
 namespace {
 
 struct ClosesHandle {
@@ -81,4 +81,4 @@ void CreateSharedDirectory(const std::string& path) {
     }
 }
 
-}  // namespace HV
+}  // namespace platform

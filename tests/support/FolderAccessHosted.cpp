@@ -1,7 +1,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
-#include "tests/installer/FolderAccess.h"
+#include "tests/support/FolderAccess.h"
 #include "tests/support/Machine.h"
 
 bool OthersMayWrite(const Machine& machine, const std::string& folder) {

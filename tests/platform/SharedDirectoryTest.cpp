@@ -1,9 +1,9 @@
-#include "installer/SharedDirectory.h"
+#include "platform/shared_directory.h"
 
 #include <gtest/gtest.h>
 
-#include "tests/installer/FolderAccess.h"
 #include "tests/support/CapturedStreams.h"
+#include "tests/support/FolderAccess.h"
 #include "tests/support/LogRecorder.h"
 #include "tests/support/Machine.h"
 
@@ -13,15 +13,15 @@ constexpr const char* kFolder = R"(C:\ProgramData\Halvorn)";
 
 TEST(SharedDirectory, LetsOthersWrite) {
     Machine machine;
-    HV::CreateSharedDirectory(kFolder);
+    platform::CreateSharedDirectory(kFolder);
     EXPECT_TRUE(machine.Exists(kFolder));
     EXPECT_TRUE(OthersMayWrite(machine, kFolder));
 }
 
 TEST(SharedDirectory, IsMadeBelowAnother) {
     Machine machine;
-    HV::CreateSharedDirectory(kFolder);
-    HV::CreateSharedDirectory(R"(C:\ProgramData\Halvorn\logs)");
+    platform::CreateSharedDirectory(kFolder);
+    platform::CreateSharedDirectory(R"(C:\ProgramData\Halvorn\logs)");
     EXPECT_TRUE(OthersMayWrite(machine, R"(C:\ProgramData\Halvorn\logs)"));
 }
 
@@ -29,21 +29,21 @@ TEST(SharedDirectory, KeepsTheAccessOfAFolderThatIsThere) {
     Machine machine;
     machine.HasFolder(kFolder);
     ASSERT_FALSE(OthersMayWrite(machine, kFolder));
-    HV::CreateSharedDirectory(kFolder);
+    platform::CreateSharedDirectory(kFolder);
     EXPECT_FALSE(OthersMayWrite(machine, kFolder));
 }
 
 TEST(SharedDirectory, LetsOnlyItselfBeOpen) {
     Machine machine;
     machine.HasFolder(kFolder);
-    HV::CreateSharedDirectory(R"(C:\ProgramData\Halvorn\logs)");
+    platform::CreateSharedDirectory(R"(C:\ProgramData\Halvorn\logs)");
     EXPECT_FALSE(OthersMayWrite(machine, kFolder));
 }
 
 TEST(SharedDirectory, MayHaveANameBeyondAscii) {
     Machine machine;
     const std::string folder = "C:\\ProgramData\\Gemeinsam f\xC3\xBCr alle";
-    HV::CreateSharedDirectory(folder);
+    platform::CreateSharedDirectory(folder);
     EXPECT_TRUE(OthersMayWrite(machine, folder));
 }
 
@@ -56,7 +56,7 @@ TEST(SharedDirectory, IsPassedOverInSilenceWhenItCannotBeMade) {
     int folders = 0;
     for (const char* folder : {R"(C:\ProgramData\missing\logs)", R"(C:\ProgramData\file)",
                                R"(C:\ProgramData\file\logs)", R"(C:\ProgramData\a|b)", R"(Q:\logs)", ""}) {
-        HV::CreateSharedDirectory(folder);
+        platform::CreateSharedDirectory(folder);
         ++folders;
     }
     EXPECT_EQ(folders, 6);

@@ -4,9 +4,9 @@
 #include <string>
 #include <vector>
 
-#include "installer/SharedDirectory.h"
-#include "platform/filesystem.h"
-#include "platform/win32.h"
+#include "platform/shared_directory.h"
+#include "platform/windows/filesystem.h"
+#include "platform/windows/win32.h"
 
 namespace scripted {
 namespace {
@@ -126,7 +126,7 @@ PVOID FreeGroup(PSID sid) {
 
 // The operation under test, with the system's answers replaced.
 #define CreateSharedDirectory CreateScriptedDirectory
-#include "installer/SharedDirectory.cpp"  // NOLINT(bugprone-suspicious-include): its calls are to be replaced.
+#include "platform/windows/shared_directory.cpp"  // NOLINT(bugprone-suspicious-include): its calls are to be replaced.
 
 namespace {
 
@@ -139,11 +139,11 @@ using Numbers = std::vector<DWORD>;
 Calls CallsWhen(const std::string& refuses) {
     script = AccessScript();
     script.refuses = refuses;
-    HV::CreateScriptedDirectory(R"(C:\shared)");
+    platform::CreateScriptedDirectory(R"(C:\shared)");
     return script.calls;
 }
 
-TEST(ScriptedSharedDirectory, AsksForOneEntryThatGrantsUsersEverything) {
+TEST(SharedDirectoryCalls, AsksForOneEntryThatGrantsUsersEverything) {
     CallsWhen("");
     EXPECT_EQ(script.made, LR"(C:\shared)");
     EXPECT_EQ(script.opened, LR"(C:\shared)");
@@ -155,17 +155,17 @@ TEST(ScriptedSharedDirectory, AsksForOneEntryThatGrantsUsersEverything) {
     EXPECT_EQ(script.writeArguments, (Numbers{1, 4}));
 }
 
-TEST(ScriptedSharedDirectory, ReleasesWhatItWasGiven) {
+TEST(SharedDirectoryCalls, ReleasesWhatItWasGiven) {
     EXPECT_EQ(CallsWhen(""), (Calls{"CreateDirectoryW", "CreateFileW", "GetSecurityInfo", "AllocateAndInitializeSid",
                                     "SetEntriesInAclW", "SetSecurityInfo", "LocalFree list", "FreeSid",
                                     "LocalFree descriptor", "CloseHandle"}));
 }
 
-TEST(ScriptedSharedDirectory, DoesNothingToAFolderThatItHasNotMade) {
+TEST(SharedDirectoryCalls, DoesNothingToAFolderThatItHasNotMade) {
     EXPECT_EQ(CallsWhen("CreateDirectoryW"), Calls{"CreateDirectoryW"});
 }
 
-TEST(ScriptedSharedDirectory, EndsInSilenceAtTheStepThatIsRefused) {
+TEST(SharedDirectoryCalls, EndsInSilenceAtTheStepThatIsRefused) {
     EXPECT_EQ(CallsWhen("CreateFileW"), (Calls{"CreateDirectoryW", "CreateFileW"}));
     EXPECT_EQ(CallsWhen("GetSecurityInfo"),
               (Calls{"CreateDirectoryW", "CreateFileW", "GetSecurityInfo", "CloseHandle"}));
