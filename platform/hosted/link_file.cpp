@@ -168,7 +168,7 @@ std::string Header(const LinkFile& link, std::uint32_t flags) {
         .U32(link.attributes)
         .Zeros(times)
         .U32(link.size)
-        .U32(static_cast<std::uint32_t>(link.iconIndex))
+        .U32(0)  // the first icon
         .U32(ShowNormal)
         .Zeros(hotKeyAndReserved)
         .Text();

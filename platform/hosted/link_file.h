@@ -9,8 +9,7 @@ namespace hosted {
 struct LinkFile {
     std::wstring target;
     std::wstring description;
-    std::wstring icon;  ///< The file with the icon; empty: the target's own.
-    std::int32_t iconIndex = 0;
+    std::wstring icon;             ///< The file whose first icon is shown; empty: the target's own.
     std::uint32_t attributes = 0;  ///< Of the target, as Windows numbers them; 0 when it does not exist.
     std::uint32_t size = 0;        ///< Of the target, its lower 32 bits.
 };

@@ -1,8 +1,12 @@
 #include <gtest/gtest.h>
 
+#include "platform/win32.h"
+
 #include <array>
 
-#include "platform/shell_link.h"
+#include <objbase.h>
+#include <shobjidl.h>
+
 #include "platform/utf8.h"
 #include "tests/support/Link.h"
 
