@@ -12,7 +12,6 @@
 #include "platform/hosted/console.h"
 #include "platform/hosted/processes.h"
 #include "platform/hosted/program.h"
-#include "platform/hosted/version_block.h"
 #include "platform/hosted/win32.h"
 #include "platform/hosted/window_messages.h"
 #endif

@@ -7,7 +7,6 @@
 #include <vector>
 
 #include "hvframework/FileVersion.h"
-#include "platform/win32.h"
 #include "tests/hosts/TestExecutables.h"
 #include "tests/support/Machine.h"
 
@@ -172,31 +171,6 @@ TEST_F(HostileExecutable, IsPassedOverWhenAPartLeadsNowhere) {
         ++checked;
     }
     EXPECT_EQ(checked, 30);
-}
-
-class VersionBlock : public testing::Test {
-protected:
-    Machine machine;
-};
-
-TEST_F(VersionBlock, HasItsRootValueAndNoOtherPart) {
-    const std::string path = TestExecutable("both-versions");
-    const DWORD size = GetFileVersionInfoSizeA(path.c_str(), nullptr);
-    ASSERT_GT(size, 0U);
-    std::string block(size, '\0');
-    ASSERT_TRUE(GetFileVersionInfoA(path.c_str(), 0, size, block.data()));
-    void* value = nullptr;
-    UINT length = 0;
-    EXPECT_TRUE(VerQueryValueA(block.data(), "\\", &value, &length));
-    EXPECT_EQ(length, sizeof(VS_FIXEDFILEINFO));
-    EXPECT_EQ(static_cast<VS_FIXEDFILEINFO*>(value)->dwSignature, 0xfeef04bdU);
-    EXPECT_FALSE(VerQueryValueA(block.data(), "\\StringFileInfo", &value, &length));
-}
-
-TEST_F(VersionBlock, DoesNotOverrunABufferThatIsTooSmall) {
-    const std::string path = TestExecutable("both-versions");
-    std::string block(GetFileVersionInfoSizeA(path.c_str(), nullptr) - 1, '\0');
-    EXPECT_FALSE(GetFileVersionInfoA(path.c_str(), 0, static_cast<DWORD>(block.size()), block.data()));
 }
 
 }  // namespace

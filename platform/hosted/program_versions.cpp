@@ -1,20 +1,20 @@
-#include "platform/hosted/version_block.h"
-
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
+#include "platform/program_versions.h"
 
 #include <algorithm>
 #include <array>
-#include <cstdint>
-#include <optional>
-#include <string>
+#include <memory>
 #include <string_view>
 #include <vector>
 
-#include "platform/hosted/host_file.h"
-#include "platform/hosted/machine.h"
+#include "platform/raw_file.h"
+#include "platform/utf8.h"
 
+// An executable is somebody else's file: it may be cut, garbled or made to do harm. Every offset and length in it is
+// checked against the file before it is followed, and the walk is as deep as a good file's and never deeper.
+//
+// Known are 32- and 64-bit images, and of a block its root value: what the logic asks for. The block is the image's
+// resource of type 16 and name 1, in the first language that it has.
+namespace platform {
 namespace {
 
 using Bytes = std::vector<unsigned char>;
@@ -27,38 +27,17 @@ std::uint32_t Number32(const Bytes& bytes, std::size_t at) {
     return Number16(bytes, at) | Number16(bytes, at + 2) << 16;
 }
 
-/// An open file that gives pieces of itself, or nothing: a piece that it does not hold whole is not given.
-class File {
-public:
-    // A pipe must not make the reader wait for a writer, hence O_NONBLOCK; it is turned away below.
-    explicit File(const std::string& name) : handle(open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK)) {
-        struct stat status {};
-        if (handle.IsOpen() && fstat(handle.Get(), &status) == 0 && S_ISREG(status.st_mode)) {
-            size = static_cast<std::uint64_t>(status.st_size);
-        }
+/// A piece of the file, or nothing where the file does not hold it whole.
+std::optional<Bytes> Read(RawFile& file, std::uint64_t offset, std::size_t count) {
+    const std::uint64_t size = file.Size();
+    // Asked before memory is taken: a garbled length must not cost more than the file is long.
+    if (offset > size || count > size - offset) {
+        return std::nullopt;
     }
-
-    std::optional<Bytes> Read(std::uint64_t offset, std::size_t count) const {
-        // Asked before memory is taken: a garbled length must not cost more than the file is long.
-        if (offset > size || count > size - offset) {
-            return std::nullopt;
-        }
-        Bytes bytes(count);
-        for (std::size_t done = 0; done < count;) {
-            const ssize_t got =
-                pread(handle.Get(), bytes.data() + done, count - done, static_cast<off_t>(offset + done));
-            if (got <= 0) {
-                return std::nullopt;
-            }
-            done += static_cast<std::size_t>(got);
-        }
-        return bytes;
-    }
-
-private:
-    hosted::Descriptor handle;
-    std::uint64_t size = 0;
-};
+    Bytes bytes(count);
+    const bool whole = file.ReadAt(offset, bytes.data(), count) == static_cast<std::int64_t>(count);
+    return whole ? std::optional(std::move(bytes)) : std::nullopt;
+}
 
 /// A piece of an image, as it lies in memory and in the file.
 struct Section {
@@ -83,9 +62,9 @@ struct Image {
 };
 
 /// Reads `count` bytes that lie at `address` once the image is loaded.
-std::optional<Bytes> ReadAt(const File& file, const Image& image, std::uint64_t address, std::size_t count) {
+std::optional<Bytes> ReadAt(RawFile& file, const Image& image, std::uint64_t address, std::size_t count) {
     const auto offset = image.FileOffset(address);
-    return offset ? file.Read(*offset, count) : std::nullopt;
+    return offset ? Read(file, *offset, count) : std::nullopt;
 }
 
 // Offsets and numbers below are those of the Portable Executable format.
@@ -130,20 +109,20 @@ std::vector<Section> Sections(const Bytes& headers) {
 }
 
 /// Nothing for a file that is no image, or one without resources.
-std::optional<Image> ReadImage(const File& file) {
-    const auto dosHeader = file.Read(0, kDosHeaderSize);
+std::optional<Image> ReadImage(RawFile& file) {
+    const auto dosHeader = Read(file, 0, kDosHeaderSize);
     if (!dosHeader || (*dosHeader)[0] != 'M' || (*dosHeader)[1] != 'Z') {
         return std::nullopt;
     }
     const std::uint64_t start = Number32(*dosHeader, 60);
-    const auto fileHeader = file.Read(start, kFileHeaderSize);
+    const auto fileHeader = Read(file, start, kFileHeaderSize);
     if (!fileHeader || Number32(*fileHeader, 0) != 0x4550) {
         return std::nullopt;
     }
     const std::size_t optionalSize = Number16(*fileHeader, 20);
-    const auto optionalHeader = file.Read(start + kFileHeaderSize, optionalSize);
+    const auto optionalHeader = Read(file, start + kFileHeaderSize, optionalSize);
     const auto sections =
-        file.Read(start + kFileHeaderSize + optionalSize, Number16(*fileHeader, 6) * kSectionHeaderSize);
+        Read(file, start + kFileHeaderSize + optionalSize, Number16(*fileHeader, 6) * kSectionHeaderSize);
     if (!optionalHeader || !sections || ResourceAddress(*optionalHeader) == 0) {
         return std::nullopt;
     }
@@ -156,7 +135,7 @@ constexpr std::uint32_t kIsDirectory = 0x80000000;
 
 /// The entry for `wanted` in the resource directory `directory` (an offset from the resources' start), or the first
 /// entry of all when none is wanted. The entry's value is an offset too, of a directory or of a piece of data.
-std::optional<std::uint32_t> FindEntry(const File& file, const Image& image, std::uint32_t directory,
+std::optional<std::uint32_t> FindEntry(RawFile& file, const Image& image, std::uint32_t directory,
                                        std::optional<std::uint32_t> wanted) {
     const std::uint64_t address = std::uint64_t{image.resources} + directory;
     const auto head = ReadAt(file, image, address, 16);
@@ -176,7 +155,7 @@ std::optional<std::uint32_t> FindEntry(const File& file, const Image& image, std
 }
 
 /// As FindEntry(), for an entry that leads to a further directory.
-std::optional<std::uint32_t> FindDirectory(const File& file, const Image& image, std::uint32_t directory,
+std::optional<std::uint32_t> FindDirectory(RawFile& file, const Image& image, std::uint32_t directory,
                                            std::uint32_t wanted) {
     const auto entry = FindEntry(file, image, directory, wanted);
     if (!entry || (*entry & kIsDirectory) == 0) {
@@ -186,7 +165,7 @@ std::optional<std::uint32_t> FindDirectory(const File& file, const Image& image,
 }
 
 /// The offset of the version resource's description: type, name, and whichever language comes first.
-std::optional<std::uint32_t> FindVersionData(const File& file, const Image& image) {
+std::optional<std::uint32_t> FindVersionData(RawFile& file, const Image& image) {
     const auto type = FindDirectory(file, image, 0, kVersionType);
     const auto name = type ? FindDirectory(file, image, *type, kVersionName) : std::nullopt;
     const auto data = name ? FindEntry(file, image, *name, std::nullopt) : std::nullopt;
@@ -200,9 +179,14 @@ constexpr std::size_t kRootLengthOffset = 2;
 constexpr std::size_t kBlockNameOffset = 6;
 constexpr std::size_t kRootValueOffset = 40;
 constexpr std::size_t kLongestBlock = 0xffff;
+// Of the root value, which may be longer and must not be shorter.
+constexpr std::size_t kFileVersionOffset = 8;
+constexpr std::size_t kProductVersionOffset = 16;
+constexpr std::size_t kRootValueSize = 52;
 
 bool IsWellFormed(const Bytes& block) {
-    if (block.size() < kRootValueOffset || block.size() - kRootValueOffset < Number16(block, kRootLengthOffset)) {
+    if (block.size() < kRootValueOffset + kRootValueSize || Number16(block, kRootLengthOffset) < kRootValueSize ||
+        block.size() - kRootValueOffset < Number16(block, kRootLengthOffset)) {
         return false;
     }
     for (std::size_t i = 0; i < kBlockName.size(); ++i) {
@@ -214,8 +198,7 @@ bool IsWellFormed(const Bytes& block) {
 }
 
 /// The version block as it stands in the file; empty when there is none that is well-formed.
-Bytes ReadVersionBlock(const std::string& hostFile) {
-    const File file(hostFile);
+Bytes ReadVersionBlock(RawFile& file) {
     const auto image = ReadImage(file);
     const auto data = image ? FindVersionData(file, *image) : std::nullopt;
     const auto description = data ? ReadAt(file, *image, std::uint64_t{image->resources} + *data, 16) : std::nullopt;
@@ -227,35 +210,23 @@ Bytes ReadVersionBlock(const std::string& hostFile) {
     return block && IsWellFormed(*block) ? *block : Bytes{};
 }
 
-Bytes ReadVersionBlockOf(LPCSTR fileName) {
-    return ReadVersionBlock(hosted::Machine::Current().HostPath(std::string_view(fileName)));
+/// A version in the root value: the first two numbers and then the last two, each pair the lower number first.
+ProgramVersions::Numbers Version(const Bytes& block, std::size_t at) {
+    const auto number = [&](std::size_t place) {
+        return static_cast<std::uint16_t>(Number16(block, kRootValueOffset + at + place));
+    };
+    return {number(2), number(0), number(6), number(4)};
 }
 
 }  // namespace
 
-DWORD GetFileVersionInfoSizeA(LPCSTR fileName, LPDWORD handle) {
-    if (handle != nullptr) {
-        *handle = 0;
+std::optional<ProgramVersions> VersionsOfProgram(const std::string& path) {
+    const auto file = OpenRawFile(WideFromUtf8(path).c_str(), RawFile::Mode::Read);
+    const Bytes block = file != nullptr ? ReadVersionBlock(*file) : Bytes{};
+    if (block.empty()) {
+        return std::nullopt;
     }
-    return static_cast<DWORD>(ReadVersionBlockOf(fileName).size());
+    return ProgramVersions{Version(block, kProductVersionOffset), Version(block, kFileVersionOffset)};
 }
 
-BOOL GetFileVersionInfoA(LPCSTR fileName, DWORD /*handle*/, DWORD size, LPVOID data) {
-    const Bytes block = ReadVersionBlockOf(fileName);
-    if (block.empty() || block.size() > size) {
-        return FALSE;
-    }
-    std::copy(block.begin(), block.end(), static_cast<unsigned char*>(data));
-    return TRUE;
-}
-
-BOOL VerQueryValueA(LPCVOID block, LPCSTR subBlock, LPVOID* value, PUINT length) {
-    if (std::string_view(subBlock) != "\\") {
-        return FALSE;
-    }
-    // The caller's interface is older than const.
-    auto* bytes = static_cast<unsigned char*>(const_cast<LPVOID>(block));
-    *value = bytes + kRootValueOffset;
-    *length = bytes[kRootLengthOffset] | static_cast<UINT>(bytes[kRootLengthOffset + 1]) << 8;
-    return TRUE;
-}
+}  // namespace platform
