@@ -10,8 +10,6 @@
 #else
 #include "platform/hosted/command.h"
 #include "platform/hosted/console.h"
-#include "platform/hosted/processes.h"
-#include "platform/hosted/program.h"
 #include "platform/hosted/win32.h"
 #include "platform/hosted/window_messages.h"
 #endif

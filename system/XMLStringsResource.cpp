@@ -5,8 +5,8 @@
 #include <iostream>
 #include <utility>
 
-#include "hvframework/XmlText.h"
-#include "platform/win32.h"
+#include "hvframework/XmlNesting.h"
+#include "platform/program.h"
 
 namespace HV {
 namespace {
@@ -16,7 +16,7 @@ using Texts = std::map<std::string, std::string>;
 /// The wizard has no choice of languages.
 constexpr const char* kLanguage = "en";
 
-constexpr WORD kTableNumber = 136;
+constexpr std::uint16_t kTableNumber = 136;
 constexpr const char* kTableType = "HVSTRINGS_XML";
 
 void Say(const std::string& line) {
@@ -143,15 +143,7 @@ void XMLStringsResource::ReplaceAll(const std::string& token, const std::string&
 }
 
 std::string LoadStringsText() {
-    const HRSRC table = FindResourceA(nullptr, MAKEINTRESOURCEA(kTableNumber), kTableType);
-    if (table == nullptr) {
-        return {};
-    }
-    const HGLOBAL loaded = LoadResource(nullptr, table);
-    const auto* bytes = static_cast<const char*>(LockResource(loaded));
-    std::string text(bytes, bytes != nullptr ? SizeofResource(nullptr, table) : 0);
-    FreeResource(loaded);
-    return text;
+    return platform::CompiledResource(kTableNumber, kTableType);
 }
 
 }  // namespace HV

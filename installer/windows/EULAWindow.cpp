@@ -5,6 +5,7 @@
 #include "installer/WizardArithmetic.h"
 #include "installer/windows/EULAWindowController.h"
 #include "installer/windows/WizardMetrics.h"
+#include "platform/program.h"
 
 namespace HV {
 
@@ -31,14 +32,7 @@ ViewerPlaces PlacesIn(HWND viewer) {
 }  // namespace
 
 std::string LoadAgreementText() {
-    const HRSRC found = ::FindResourceA(nullptr, MAKEINTRESOURCEA(kAgreement), "RICHTEXTFORMAT");
-    const HGLOBAL loaded = found == nullptr ? nullptr : ::LoadResource(nullptr, found);
-    const auto* const bytes = loaded == nullptr ? nullptr : static_cast<const char*>(::LockResource(loaded));
-    // It does not end in a zero: its size is the only end that it has.
-    std::string text = bytes == nullptr ? std::string() : std::string(bytes, ::SizeofResource(nullptr, found));
-    if (loaded != nullptr) {
-        ::FreeResource(loaded);
-    }
+    const std::string text = platform::CompiledResource(kAgreement, "RICHTEXTFORMAT");
     return text.empty() ? "ERROR: license agreement data failed to load from resource." : text;
 }
 

@@ -1,14 +1,11 @@
-#include "platform/hosted/program.h"
+#include "platform/program.h"
 
-#include <linux/limits.h>
-#include <unistd.h>
-
-#include <algorithm>
-#include <cstring>
-#include <string>
+#include <filesystem>
 
 #include "platform/hosted/ignoring_case.h"
-#include "platform/hosted/processes.h"
+#include "platform/hosted/machine.h"
+#include "platform/hosted/program.h"
+#include "platform/utf8.h"
 
 namespace hosted {
 namespace {
@@ -18,73 +15,38 @@ constinit const CompiledResource* first = nullptr;
 
 }  // namespace
 
-CompiledResource::CompiledResource(std::uint16_t number, const char* type, const char* begin, const char* end)
-    : number_(number), type_(type), begin_(begin), end_(end), next_(first) {
+CompiledResource::CompiledResource(std::uint16_t itsNumber, const char* itsType, const char* begin, const char* end)
+    : number(itsNumber), type(itsType), bytes(begin, end), next(first) {
     first = this;
 }
 
-const CompiledResource* CompiledResource::Find(std::uintptr_t number, const char* type) {
-    const CompiledResource* resource = first;
-    while (resource != nullptr && (resource->number_ != number || !EqualsIgnoringCase(resource->type_, type))) {
-        resource = resource->next_;
+// The host marks the name of a file that has been deleted; a file may also be named so.
+std::string ProgramOfProcess(const std::string& process) {
+    constexpr std::string_view mark = " (deleted)";
+    const std::filesystem::path link = "/proc/" + process + "/exe";
+    std::error_code error;
+    std::string name = std::filesystem::read_symlink(link, error).string();
+    if (name.ends_with(mark) && !std::filesystem::equivalent(name, link, error)) {
+        name.resize(name.size() - mark.size());
     }
-    return resource;
+    return platform::Utf8FromWide(Machine::Current().WindowsPath(name));
 }
 
 }  // namespace hosted
 
-namespace {
+namespace platform {
 
-using hosted::CompiledResource;
-
-bool IsNumber(LPCSTR name) {
-    return reinterpret_cast<std::uintptr_t>(name) <= 0xFFFF;
+std::string ProgramPath() {
+    constexpr std::size_t longest = 260;
+    return hosted::ProgramOfProcess("self").substr(0, longest);
 }
 
-const CompiledResource* ResourceOf(const void* handle) {
-    return static_cast<const CompiledResource*>(handle);
-}
-
-}  // namespace
-
-DWORD GetModuleFileNameA(HMODULE /*module*/, LPSTR buffer, DWORD size) {
-    const std::string path = hosted::ProgramOfProcess(getpid());
-    const std::size_t length = path.copy(buffer, size);
-    if (length < size) {
-        buffer[length] = '\0';
-        SetLastError(static_cast<DWORD>(ERROR_SUCCESS));
-    } else {
-        if (size > 0) {
-            buffer[size - 1] = '\0';
-        }
-        SetLastError(static_cast<DWORD>(ERROR_INSUFFICIENT_BUFFER));
+std::string CompiledResource(std::uint16_t number, const char* type) {
+    const hosted::CompiledResource* resource = hosted::first;
+    while (resource != nullptr && (resource->number != number || !hosted::EqualsIgnoringCase(resource->type, type))) {
+        resource = resource->next;
     }
-    return static_cast<DWORD>(length);
+    return resource != nullptr ? std::string(resource->bytes) : std::string();
 }
 
-HRSRC FindResourceA(HMODULE /*module*/, LPCSTR name, LPCSTR type) {
-    const CompiledResource* found = IsNumber(name) && !IsNumber(type)
-                                        ? CompiledResource::Find(reinterpret_cast<std::uintptr_t>(name), type)
-                                        : nullptr;
-    if (found == nullptr) {
-        SetLastError(static_cast<DWORD>(ERROR_RESOURCE_NAME_NOT_FOUND));
-    }
-    // The caller's handles are older than const.
-    return reinterpret_cast<HRSRC>(const_cast<CompiledResource*>(found));
-}
-
-HGLOBAL LoadResource(HMODULE /*module*/, HRSRC resource) {
-    return resource;
-}
-
-DWORD SizeofResource(HMODULE /*module*/, HRSRC resource) {
-    return resource != nullptr ? static_cast<DWORD>(ResourceOf(resource)->Size()) : 0;
-}
-
-LPVOID LockResource(HGLOBAL loaded) {
-    return loaded != nullptr ? const_cast<char*>(ResourceOf(loaded)->Bytes()) : nullptr;
-}
-
-BOOL FreeResource(HGLOBAL /*loaded*/) {
-    return FALSE;
-}
+}  // namespace platform

@@ -180,7 +180,7 @@ TEST_F(ScriptedModelProcessesTest, FindsNothingWhenTheListCannotBeHad) {
 
 TEST_F(ScriptedModelProcessesTest, FindsForHitFilmAProcessThatCannotBeNamed) {
     script.Runs("").Runs("no-backslash.exe");
-    script.processes.push_back({.number = 4, .path = R"(C:\hidden.exe)", .showsModules = false});
+    script.processes.push_back({.number = 4});
     Uses({"hitfilm"});
     std::vector<HV::ProcessRecord> found;
     EXPECT_TRUE(model.FindRunningHosts(found));

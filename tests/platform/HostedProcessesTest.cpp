@@ -1,4 +1,4 @@
-// How the host's processes appear on the machine. On Windows these names are the system's own.
+// How the host's processes appear on the machine.
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <signal.h>
@@ -14,40 +14,35 @@
 #include <thread>
 #include <vector>
 
-#include "platform/win32.h"
+#include "platform/files.h"
+#include "platform/running_processes.h"
 #include "tests/support/Machine.h"
 #include "tests/support/RunningProgram.h"
 
 namespace {
 
-std::vector<DWORD> Listed() {
-    std::vector<DWORD> numbers(100'000);
-    DWORD filled = 0;
-    EXPECT_TRUE(K32EnumProcesses(numbers.data(), static_cast<DWORD>(numbers.size() * sizeof(DWORD)), &filled));
-    numbers.resize(filled / sizeof(DWORD));
+constexpr std::size_t kMany = 100'000;
+
+std::vector<platform::RunningProcess> Running(std::size_t most = kMany) {
+    const auto running = platform::RunningProcesses(most);
+    EXPECT_TRUE(running.has_value());
+    return running.value_or(std::vector<platform::RunningProcess>{});
+}
+
+std::vector<std::string> Paths() {
+    std::vector<std::string> paths;
+    std::ranges::transform(Running(), std::back_inserter(paths), &platform::RunningProcess::program);
+    return paths;
+}
+
+std::vector<std::uint32_t> Numbers() {
+    std::vector<std::uint32_t> numbers;
+    std::ranges::transform(Running(), std::back_inserter(numbers), &platform::RunningProcess::number);
     return numbers;
 }
 
-std::string PathOf(HANDLE process) {
-    HMODULE module = nullptr;
-    DWORD needed = 0;
-    char path[4096] = "";
-    EXPECT_TRUE(K32EnumProcessModules(process, &module, sizeof module, &needed));
-    EXPECT_EQ(needed, sizeof module);
-    const DWORD length = K32GetModuleFileNameExA(process, module, path, sizeof path);
-    return {path, length};
-}
-
-/// The paths of all processes that can be opened.
-std::vector<std::string> Paths() {
-    std::vector<std::string> paths;
-    for (const DWORD number : Listed()) {
-        if (const HANDLE process = OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, number)) {
-            paths.push_back(PathOf(process));
-            EXPECT_TRUE(CloseHandle(process));
-        }
-    }
-    return paths;
+bool IsSeen(pid_t process) {
+    return std::ranges::count(Numbers(), static_cast<std::uint32_t>(process)) != 0;
 }
 
 bool Has(const std::vector<std::string>& paths, const std::string& path) {
@@ -88,148 +83,107 @@ private:
     int status_ = 0;
 };
 
-TEST(HostedProcesses, LieOnDriveCInsideTheMachine) {
+class HostedProcesses : public testing::Test {
+protected:
     Machine machine;
+};
+
+TEST_F(HostedProcesses, LieOnDriveCInsideTheMachine) {
     const std::string path = R"(C:\Program Files\Adobe\AfterFX.exe)";
     const RunningProgram program(machine, path);
     EXPECT_TRUE(Has(Paths(), path));
 }
 
-TEST(HostedProcesses, LieOnDriveZOutsideOfIt) {
-    const Machine machine;
+TEST_F(HostedProcesses, LieOnDriveZOutsideOfIt) {
     std::string path = "Z:" + std::filesystem::read_symlink("/proc/self/exe").string();
     std::ranges::replace(path, '/', '\\');
     EXPECT_TRUE(Has(Paths(), path));
 }
 
-TEST(HostedProcesses, KeepTheirPathWhenTheirFileGoes) {
-    Machine machine;
+TEST_F(HostedProcesses, KeepTheirPathWhenTheirFileGoes) {
     const std::string path = R"(C:\Program Files\Adobe\AfterFX.exe)";
     const RunningProgram program(machine, path);
-    ASSERT_EQ(_unlink(path.c_str()), 0);
+    ASSERT_EQ(platform::RemoveFile(path), 0);
     EXPECT_TRUE(Has(Paths(), path));
 }
 
-TEST(HostedProcesses, MayHaveTheNameThatTheHostGivesToDeletedFiles) {
-    Machine machine;
+TEST_F(HostedProcesses, MayHaveTheNameThatTheHostGivesToDeletedFiles) {
     const std::string path = R"(C:\Program Files\AfterFX.exe (deleted))";
     const RunningProgram program(machine, path);
     EXPECT_TRUE(Has(Paths(), path));
 }
 
-TEST(HostedProcesses, AreListedInRisingOrder) {
-    const auto numbers = Listed();
-    EXPECT_TRUE(std::ranges::is_sorted(numbers));
-    EXPECT_EQ(std::ranges::count(numbers, static_cast<DWORD>(getpid())), 1);
+TEST_F(HostedProcesses, MayHaveAPathThatIsTooLongToBeToldWhole) {
+    std::string path = "C:";
+    while (path.size() <= platform::kLongestProgram) {
+        path += "\\" + std::string(200, 'x');
+    }
+    const RunningProgram program(machine, path);
+    EXPECT_TRUE(Has(Paths(), path.substr(0, platform::kLongestProgram)));
 }
 
-TEST(HostedProcesses, AreNotTheThreadsWithinThem) {
-    std::atomic<DWORD> thread{0};
+TEST_F(HostedProcesses, AreListedInRisingOrder) {
+    const auto numbers = Numbers();
+    EXPECT_TRUE(std::ranges::is_sorted(numbers));
+    EXPECT_EQ(std::ranges::count(numbers, static_cast<std::uint32_t>(getpid())), 1);
+}
+
+TEST_F(HostedProcesses, AreNotTheThreadsWithinThem) {
+    std::atomic<pid_t> thread{0};
     std::atomic<bool> end{false};
     std::thread other([&] {
-        thread = static_cast<DWORD>(gettid());
+        thread = gettid();
         thread.notify_one();
         end.wait(false);
     });
     thread.wait(0);
-    EXPECT_EQ(std::ranges::count(Listed(), thread.load()), 0);
+    EXPECT_FALSE(IsSeen(thread));
     end = true;
     end.notify_one();
     other.join();
 }
 
-TEST(HostedProcesses, AreListedAsFarAsThereIsRoom) {
-    const auto all = Listed();
-    ASSERT_GE(all.size(), 2U);
-    DWORD numbers[2] = {};
-    DWORD filled = 0;
-    EXPECT_TRUE(K32EnumProcesses(numbers, 7, &filled));
-    EXPECT_EQ(filled, 4U);
-    EXPECT_EQ(numbers[0], all[0]);
-    EXPECT_EQ(numbers[1], 0U);
+TEST_F(HostedProcesses, AreSeenAsFarAsOneLooks) {
+    EXPECT_LE(Running(1).size(), 1U);
+    EXPECT_TRUE(Running(0).empty());
 }
 
-TEST(HostedProcesses, CannotBeListedWithoutADescriptor) {
+TEST_F(HostedProcesses, CannotBeListedWithoutADescriptor) {
     rlimit before{};
     getrlimit(RLIMIT_NOFILE, &before);
     const rlimit none{0, before.rlim_max};
     setrlimit(RLIMIT_NOFILE, &none);
-    DWORD number = 0;
-    DWORD filled = 0;
-    const BOOL listed = K32EnumProcesses(&number, sizeof number, &filled);
+    const bool listed = platform::RunningProcesses(kMany).has_value();
     setrlimit(RLIMIT_NOFILE, &before);
     EXPECT_FALSE(listed);
 }
 
-TEST(HostedProcesses, CannotBeOpenedWhenThereAreNone) {
+TEST_F(HostedProcesses, AreNotSeenOnceTheyHaveEnded) {
     Child child([] { return 0; });
-    const auto number = static_cast<DWORD>(child.number);
-    child.Wait();
-    EXPECT_EQ(OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, number), nullptr);
-    EXPECT_EQ(GetLastError(), DWORD{ERROR_INVALID_PARAMETER});
-}
-
-TEST(HostedProcesses, CannotBeOpenedOnceTheyHaveEnded) {
-    const Child child([] { return 0; });
     child.WaitForEnd();
-    EXPECT_EQ(OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, static_cast<DWORD>(child.number)), nullptr);
-    EXPECT_EQ(GetLastError(), DWORD{ERROR_ACCESS_DENIED});
+    EXPECT_FALSE(IsSeen(child.number)) << "nobody has taken notice of its end yet";
+    const pid_t number = child.number;
+    child.Wait();
+    EXPECT_FALSE(IsSeen(number));
 }
 
-TEST(HostedProcesses, CannotBeOpenedByAnotherUser) {
-    const auto target = static_cast<DWORD>(geteuid() == 0 ? getpid() : 1);
+TEST_F(HostedProcesses, AreNotSeenByAnotherUser) {
+    const pid_t target = geteuid() == 0 ? getpid() : 1;
     Child child([target] {
         constexpr uid_t nobody = 65534;
         if (geteuid() == 0 && (setgid(nobody) != 0 || setuid(nobody) != 0)) {
             return 2;
         }
-        return OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, target) == nullptr ? 0 : 1;
+        return IsSeen(target) ? 1 : 0;
     });
     EXPECT_EQ(child.Wait(), 0);
 }
 
-TEST(HostedProcesses, TellWhoRunsThem) {
-    const HANDLE process = OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, static_cast<DWORD>(getpid()));
-    HANDLE token = nullptr;
-    ASSERT_TRUE(OpenProcessToken(process, TOKEN_READ, &token));
-    DWORD needed = 0;
-    EXPECT_FALSE(GetTokenInformation(token, TokenUser, nullptr, 0, &needed));
-    EXPECT_EQ(GetLastError(), DWORD{ERROR_INSUFFICIENT_BUFFER});
-    ASSERT_EQ(needed, 4U);
-    DWORD user = 0;
-    EXPECT_TRUE(GetTokenInformation(token, TokenUser, &user, sizeof user, &needed));
-    EXPECT_EQ(user, geteuid());
-    EXPECT_TRUE(CloseHandle(token));
-    EXPECT_TRUE(CloseHandle(process));
-}
-
-TEST(HostedProcesses, GiveWhatFitsOfTheirPath) {
-    const Machine machine;
-    const HANDLE process = OpenProcess(PROCESS_QUERY_INFORMATION, FALSE, static_cast<DWORD>(getpid()));
-    char path[5] = "xxxx";
-    EXPECT_EQ(K32GetModuleFileNameExA(process, nullptr, path, 4), 4U);
-    EXPECT_STREQ(path, "Z:\\");
-    EXPECT_EQ(K32GetModuleFileNameExA(process, nullptr, path, 0), 0U);
-}
-
-// Windows says so of itself; Wine leaves the end out.
-TEST(HostedModuleName, IsTerminatedWhereItIsCut) {
-    const Machine machine;
-    char path[] = "xxxxxxxxx";
-    EXPECT_EQ(GetModuleFileNameA(nullptr, path, 4), 4U);
-    EXPECT_STREQ(path, "Z:\\");
-}
-
-TEST(HostedProcesses, AnswerOnlyToTheirOwnHandles) {
-    HANDLE token = nullptr;
-    HMODULE module = nullptr;
-    DWORD needed = 0;
-    char path[16] = "";
-    EXPECT_FALSE(OpenProcessToken(nullptr, TOKEN_READ, &token));
-    EXPECT_FALSE(K32EnumProcessModules(INVALID_HANDLE_VALUE, &module, sizeof module, &needed));
-    EXPECT_EQ(K32GetModuleFileNameExA(nullptr, nullptr, path, sizeof path), 0U);
-    EXPECT_FALSE(GetTokenInformation(nullptr, TokenUser, nullptr, 0, &needed));
-    EXPECT_EQ(GetLastError(), DWORD{ERROR_INVALID_HANDLE});
+TEST_F(HostedProcesses, TellWhoRunsThem) {
+    const auto all = Running();
+    const auto own = std::ranges::find(all, static_cast<std::uint32_t>(getpid()), &platform::RunningProcess::number);
+    ASSERT_NE(own, all.end());
+    EXPECT_EQ(own->ownerTag, geteuid());
 }
 
 }  // namespace

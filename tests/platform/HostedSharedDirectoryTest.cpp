@@ -32,7 +32,7 @@ private:
     mode_t before_;
 };
 
-TEST(HostedSharedDirectory, IsOpenToEverybodyWhoeverMakesIt) {
+TEST(HostedSharedDirectory, IsOpenToEverybodyWhicheverUserMakesIt) {
     Machine machine;
     const PrivateMaker maker;
     platform::CreateSharedDirectory(kFolder);
