@@ -21,4 +21,9 @@ namespace platform {
 /// As the runtime's fopen_s; null on failure. The caller closes it.
 [[nodiscard]] std::FILE* OpenStream(const std::string& path, const char* mode);
 
+/// Opens the file at `path` for writing, in binary, made anew or emptied; null on failure. What is opened has no other
+/// name and is reached by none: a link there is not followed, and where the file has a second name somewhere nothing is
+/// opened. The folders above are the caller's business.
+[[nodiscard]] std::FILE* OpenOwnFile(const std::string& path);
+
 }  // namespace platform

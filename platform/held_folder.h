@@ -43,4 +43,9 @@ std::unique_ptr<HeldFolder> MakePrivateFolder(const std::string& path, NoFolder&
 /// `planted` empty when there is no such folder, or it cannot be held.
 std::unique_ptr<HeldFolder> HoldFolder(const std::string& path, std::string& planted);
 
+/// Holds the folder at `path` unless a link stands there, whoever made it: for a folder that this program has made just
+/// now, and that nobody has made a link since. Null with `isLink` when there is one; null without it when there is no
+/// such folder, or it cannot be held.
+std::unique_ptr<HeldFolder> HoldOwnFolder(const std::string& path, bool& isLink);
+
 }  // namespace platform

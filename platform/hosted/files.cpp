@@ -1,5 +1,6 @@
 #include "platform/files.h"
 
+#include "platform/hosted/host_file.h"
 #include "platform/win32.h"
 
 namespace platform {
@@ -19,6 +20,10 @@ bool RemoveEmptyDirectory(const std::string& path) {
 std::FILE* OpenStream(const std::string& path, const char* mode) {
     std::FILE* file = nullptr;
     return fopen_s(&file, path.c_str(), mode) == 0 ? file : nullptr;
+}
+
+std::FILE* OpenOwnFile(const std::string& path) {
+    return hosted::OpenOwnFile(path);
 }
 
 }  // namespace platform

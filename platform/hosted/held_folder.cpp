@@ -7,8 +7,7 @@
 #include <algorithm>
 #include <cerrno>
 
-#include "platform/hosted/held_folders.h"
-#include "platform/hosted/host_file.h"
+#include "platform/hosted/host_folder.h"
 #include "platform/hosted/machine.h"
 #include "platform/utf8.h"
 
@@ -18,25 +17,6 @@ namespace {
 using hosted::Descriptor;
 using hosted::HeldFolders;
 using hosted::Machine;
-
-class HostFolder : public HeldFolder {
-public:
-    /// Owns the descriptor.
-    HostFolder(std::string path, const std::string& hostPath, int descriptor)
-        : path_(std::move(path)), descriptor_(descriptor) {
-        HeldFolders::All().Add(hostPath, descriptor_);
-    }
-    ~HostFolder() override {
-        HeldFolders::All().Remove(descriptor_);
-        close(descriptor_);
-    }
-
-    [[nodiscard]] const std::string& Path() const override { return path_; }
-
-private:
-    std::string path_;
-    int descriptor_;
-};
 
 /// Goes down from one folder to the next, each opened in the one before: what is looked at is what is entered.
 class WayDown {
@@ -91,7 +71,7 @@ std::unique_ptr<HeldFolder> MakePrivateFolder(const std::string& path, NoFolder&
         reason = NoFolder::Taken;
         return nullptr;
     }
-    return std::make_unique<HostFolder>(path, hostPath, folder.Give());
+    return std::make_unique<hosted::HostFolder>(path, hostPath, std::move(folder));
 }
 
 std::unique_ptr<HeldFolder> HoldFolder(const std::string& path, std::string& planted) {
@@ -116,7 +96,17 @@ std::unique_ptr<HeldFolder> HoldFolder(const std::string& path, std::string& pla
         at = end;
     }
     Descriptor folder = way.Open();
-    return folder.IsOpen() ? std::make_unique<HostFolder>(path, hostPath, folder.Give()) : nullptr;
+    return folder.IsOpen() ? std::make_unique<hosted::HostFolder>(path, hostPath, std::move(folder)) : nullptr;
+}
+
+std::unique_ptr<HeldFolder> HoldOwnFolder(const std::string& path, bool& isLink) {
+    const std::string hostPath = Machine::Current().HostPath(path);
+    Descriptor folder(open(hostPath.c_str(), O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC));
+    struct stat found {};
+    isLink = !folder.IsOpen() && lstat(hostPath.c_str(), &found) == 0 && S_ISLNK(found.st_mode);
+    return folder.IsOpen()
+               ? std::make_unique<hosted::HostFolder>(path, HeldFolders::All().Back(hostPath), std::move(folder))
+               : nullptr;
 }
 
 }  // namespace platform

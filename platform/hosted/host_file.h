@@ -2,6 +2,7 @@
 
 #include <sys/stat.h>
 
+#include <cstdio>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -33,6 +34,9 @@ private:
 
 /// 0, or the errno with which the host stopped taking the bytes.
 [[nodiscard]] int WriteAll(int descriptor, std::string_view bytes);
+
+/// As platform::OpenOwnFile() says. `path` is the machine's.
+[[nodiscard]] std::FILE* OpenOwnFile(std::string_view path);
 
 /// Without any right to write: what Windows calls read-only, and keeps from being written and deleted whoever asks. The
 /// host lets root do both.

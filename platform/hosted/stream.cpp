@@ -28,11 +28,13 @@ struct Mode {
     char kind = 'r';
     bool both = false;
     bool text = true;
+    bool itself = false;  ///< Neither a link nor a file with a second name.
 
     [[nodiscard]] bool Writes() const { return kind != 'r' || both; }
     [[nodiscard]] int Flags() const {
         const int access = both ? O_RDWR : kind == 'r' ? O_RDONLY : O_WRONLY;
-        return access | O_CLOEXEC | (kind == 'w' ? O_TRUNC : kind == 'a' ? O_APPEND : 0);
+        const int contents = kind == 'w' && !itself ? O_TRUNC : kind == 'a' ? O_APPEND : 0;
+        return access | O_CLOEXEC | contents | (itself ? O_NOFOLLOW | O_NONBLOCK : 0);
     }
     /// As the host's own calls take it.
     [[nodiscard]] std::string Name() const { return std::string(1, kind) + (both ? "+" : ""); }
@@ -72,6 +74,18 @@ int OpenExisting(const std::string& hostPath, const Mode& mode) {
     return descriptor;
 }
 
+/// Empties a file that is there only once it is known to be no other. -1 and errno where it is one.
+int EmptiedItself(int descriptor) {
+    Stat found{};
+    if (fstat(descriptor, &found) == 0 && S_ISREG(found.st_mode) && found.st_nlink == 1 &&
+        ftruncate(descriptor, 0) == 0) {
+        return descriptor;
+    }
+    close(descriptor);
+    errno = EACCES;
+    return -1;
+}
+
 int Open(const std::string& hostPath, const Mode& mode) {
     if (mode.Writes()) {
         if (const int error = Machine::Current().GetFaults().Check(Operation::Create, hostPath)) {
@@ -90,7 +104,8 @@ int Open(const std::string& hostPath, const Mode& mode) {
             return descriptor;
         }
     }
-    return OpenExisting(hostPath, mode);
+    const int descriptor = OpenExisting(hostPath, mode);
+    return descriptor >= 0 && mode.itself ? EmptiedItself(descriptor) : descriptor;
 }
 
 /// What stands between a stream and its file where the two differ: in text mode, and where writes may have to fail.
@@ -213,7 +228,39 @@ FILE* FilteredStream(int descriptor, const std::string& hostPath, const Mode& mo
     return stream;
 }
 
+/// 0 and the stream, or the errno.
+int OpenStream(std::string_view path, const Mode& mode, FILE*& stream) {
+    const std::string hostPath = Machine::Current().HostPath(path);
+    const int descriptor = Open(hostPath, mode);
+    if (descriptor < 0) {
+        return errno;
+    }
+    hosted::MarkAsOpen(descriptor);
+    const bool mayFail = mode.Writes() && Machine::Current().GetFaults().Armed();
+    stream =
+        mode.text || mayFail ? FilteredStream(descriptor, hostPath, mode) : fdopen(descriptor, mode.Name().c_str());
+    if (stream == nullptr) {
+        const int error = errno;
+        close(descriptor);
+        return error;
+    }
+    return 0;
+}
+
 }  // namespace
+
+namespace hosted {
+
+FILE* OpenOwnFile(std::string_view path) {
+    Mode mode;
+    mode.kind = 'w';
+    mode.text = false;
+    mode.itself = true;
+    FILE* stream = nullptr;
+    return OpenStream(path, mode, stream) == 0 ? stream : nullptr;
+}
+
+}  // namespace hosted
 
 errno_t fopen_s(FILE** stream, const char* path, const char* mode) {
     if (stream == nullptr || path == nullptr || mode == nullptr) {
@@ -224,19 +271,6 @@ errno_t fopen_s(FILE** stream, const char* path, const char* mode) {
     if (!parsed) {
         return EINVAL;
     }
-    const std::string hostPath = Machine::Current().HostPath(std::string_view(path));
-    const int descriptor = Open(hostPath, *parsed);
-    if (descriptor < 0) {
-        return hosted::FailureOf(errno).runtime;
-    }
-    hosted::MarkAsOpen(descriptor);
-    const bool mayFail = parsed->Writes() && Machine::Current().GetFaults().Armed();
-    *stream = parsed->text || mayFail ? FilteredStream(descriptor, hostPath, *parsed)
-                                      : fdopen(descriptor, parsed->Name().c_str());
-    if (*stream == nullptr) {
-        const int error = errno;
-        close(descriptor);
-        return hosted::FailureOf(error).runtime;
-    }
-    return 0;
+    const int error = OpenStream(path, *parsed, *stream);
+    return error == 0 ? 0 : hosted::FailureOf(error).runtime;
 }

@@ -23,6 +23,8 @@ public:
 
     [[nodiscard]] bool IsOpen() const { return handle_ != nullptr; }
     [[nodiscard]] HANDLE Get() const { return handle_; }
+    /// Leaves the handle to the caller.
+    [[nodiscard]] HANDLE Give() { return std::exchange(handle_, nullptr); }
 
 private:
     HANDLE handle_;
