@@ -2,7 +2,9 @@
 #include <cstdio>
 #include <memory>
 #include <new>
+#include <string_view>
 #include <unordered_set>
+#include <vector>
 
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
@@ -11,6 +13,7 @@
 #include "package/ZipEntries.h"
 #include "platform/files.h"
 #include "platform/filesystem.h"
+#include "platform/held_folder.h"
 
 namespace HV {
 namespace {
@@ -34,6 +37,50 @@ private:
     std::size_t room_ = 0;
 };
 
+/// What stands before the last `/`; empty without one.
+std::string FolderOf(const std::string& path) {
+    const auto end = path.rfind('/');
+    return end == std::string::npos ? "" : path.substr(0, end);
+}
+
+/// The folders that lead to the entry that is being written, each held, so that none of them is or becomes a link.
+class HeldWay {
+public:
+    explicit HeldWay(std::string destination) : destination_(std::move(destination)) {}
+
+    /// Holds what is there of `folder`, a path as EntryPath() gives it, and of the folders above it. False when one of
+    /// them is a link. Nearly always the entry before was in the same folder.
+    [[nodiscard]] bool Enter(const std::string& folder) {
+        if (!steps_.empty() && steps_.back().folder == folder) {
+            return true;
+        }
+        while (!steps_.empty() && !folder.starts_with(steps_.back().folder + "/")) {
+            steps_.pop_back();
+        }
+        while (HeldPart() < folder.size()) {
+            bool isLink = false;
+            std::string next = folder.substr(0, folder.find('/', HeldPart() + 1));
+            auto held = platform::HoldOwnFolder(HVL::FileUtils::JoinPath(destination_, next), isLink);
+            if (held == nullptr) {
+                return !isLink;
+            }
+            steps_.push_back({std::move(next), std::move(held)});
+        }
+        return true;
+    }
+
+private:
+    struct Step {
+        std::string folder;
+        std::unique_ptr<platform::HeldFolder> held;
+    };
+
+    [[nodiscard]] std::size_t HeldPart() const { return steps_.empty() ? 0 : steps_.back().folder.size(); }
+
+    std::string destination_;
+    std::vector<Step> steps_;
+};
+
 /// The folders that extraction makes: those with an entry of their own, and those above them.
 class EntryFolders {
 public:
@@ -52,11 +99,6 @@ public:
     }
 
 private:
-    static std::string FolderOf(const std::string& path) {
-        const auto end = path.rfind('/');
-        return end == std::string::npos ? "" : path.substr(0, end);
-    }
-
     std::unordered_set<std::string> folders_;
 };
 
@@ -90,28 +132,40 @@ bool WriteAll(std::FILE* file, const char* bytes, std::size_t size) {
     return true;
 }
 
-bool WriteCurrentFile(ZipEntries& archive, EntryBuffer& buffer, const std::string& name, const std::string& target) {
-    std::FILE* const file = platform::OpenStream(target, "wb");
+constexpr const char* kLinkOnTheWay = "a folder that it goes into has become a link";
+
+/// Opens the file that the entry becomes; null, with the reason logged where there is one to tell.
+std::FILE* OpenTarget(ZipEntries& archive, HeldWay& way, const std::string& name, const std::string& target) {
+    if (!way.Enter(FolderOf(EntryPath(name)))) {
+        LogEntryProblem(name, kLinkOnTheWay);
+        return nullptr;
+    }
+    std::FILE* const file = platform::OpenOwnFile(target);
     if (file == nullptr) {
         if (const std::string problem = EntryFolders(archive).ProblemOf(name); !problem.empty()) {
             LogEntryProblem(name, problem);
         }
-        return false;
     }
+    return file;
+}
+
+bool WriteCurrentFile(ZipEntries& archive, EntryBuffer& buffer, const std::string& name, std::FILE* file) {
     const auto size = static_cast<std::size_t>(archive.FileSize());
     const char* bytes = Unpack(archive, buffer, name);
     const bool written = bytes != nullptr && WriteAll(file, bytes, size);
     return std::fclose(file) == 0 && written;
 }
 
-int ExtractFile(ZipEntries& archive, std::size_t place, EntryBuffer& buffer, const std::string& destination) {
+int ExtractFile(ZipEntries& archive, std::size_t place, EntryBuffer& buffer, HeldWay& way,
+                const std::string& destination) {
     const std::string& name = archive.Files()[place];
     if (!archive.OpenFile(place)) {
         LogEntryProblem(name, archive.Problem());
         HVL_LOG(Error, "ERROR: failed to open zip file entry " << name);
         return -1;
     }
-    if (!WriteCurrentFile(archive, buffer, name, HVL::FileUtils::JoinPath(destination, name))) {
+    std::FILE* const file = OpenTarget(archive, way, name, HVL::FileUtils::JoinPath(destination, name));
+    if (file == nullptr || !WriteCurrentFile(archive, buffer, name, file)) {
         HVL_LOG(Error, "ERROR: failed to write zip entry file " << name);
         return -1;
     }
@@ -125,14 +179,15 @@ int MakeEntryDirectory(const std::string& joined) {
     return HVL::FileUtils::CreateDirectories(path);
 }
 
-int ExtractDirectory(ZipEntries& archive, std::size_t place, const std::string& destination) {
+int ExtractDirectory(ZipEntries& archive, std::size_t place, HeldWay& way, const std::string& destination) {
     const std::string& name = archive.Directories()[place];
     const std::string path = HVL::FileUtils::JoinPath(destination, name);
     const bool sound = archive.CheckDirectory(place);
-    if (!sound) {
-        LogEntryProblem(name, archive.Problem());
+    const bool straight = sound && way.Enter(FolderOf(EntryPath(name)));
+    if (!straight) {
+        LogEntryProblem(name, sound ? kLinkOnTheWay : archive.Problem());
     }
-    const int result = sound ? MakeEntryDirectory(path) : -1;
+    const int result = straight ? MakeEntryDirectory(path) : -1;
     if (result != 0) {
         HVL_LOG(Error, "ERROR: failed to create directory " << path);
     }
@@ -153,14 +208,15 @@ bool HasRoom(const std::string& destination, const ZipEntries& archive) {
 }
 
 int ExtractEntries(ZipEntries& archive, const std::string& destination) {
+    HeldWay way(destination);
     for (std::size_t place = 0; place < archive.Directories().size(); ++place) {
-        if (const int result = ExtractDirectory(archive, place, destination); result != 0) {
+        if (const int result = ExtractDirectory(archive, place, way, destination); result != 0) {
             return result;
         }
     }
     EntryBuffer buffer;
     for (std::size_t place = 0; place < archive.Files().size(); ++place) {
-        if (const int result = ExtractFile(archive, place, buffer, destination); result != 0) {
+        if (const int result = ExtractFile(archive, place, buffer, way, destination); result != 0) {
             return result;
         }
     }

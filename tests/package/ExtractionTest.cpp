@@ -1,7 +1,10 @@
 #include <gtest/gtest.h>
 
+#include <filesystem>
+
 #include "package/ZipEntries.h"
 #include "tests/support/ArchiveBuilder.h"
+#include "tests/support/HostLink.h"
 #include "tests/support/LogRecorder.h"
 #include "tests/support/Machine.h"
 
@@ -117,6 +120,46 @@ TEST_F(ExtractionTest, ReplacesAFileThatIsThere) {
     machine.Has(R"(C:\out\a)", "a longer old content");
     EXPECT_EQ(Extract({{.name = "a", .bytes = "new"}}), 0);
     EXPECT_EQ(machine.Content(R"(C:\out\a)"), "new");
+}
+
+TEST_F(ExtractionTest, WritesNothingIntoAFileThatHasASecondName) {
+    machine.Has(R"(C:\victim)", "somebody else's");
+    machine.HasFolder(kOut);
+    std::filesystem::create_hard_link(machine.HostName(R"(C:\victim)"), machine.HostName(kOut + R"(\a)"));
+    EXPECT_EQ(Extract({{.name = "a", .bytes = "new"}}), -1);
+    EXPECT_EQ(machine.Content(R"(C:\victim)"), "somebody else's");
+}
+
+TEST_F(ExtractionTest, WritesNothingThroughALinkInPlaceOfAFolder) {
+    machine.HasFolder(R"(C:\victim)");
+    machine.HasFolder(kOut + R"(\sub)");
+    const HostLink link(machine, kOut + R"(\sub\deeper)", R"(C:\victim)");
+    EXPECT_EQ(Extract({{.name = "sub/"},
+                       {.name = "sub/deeper/"},
+                       {.name = "sub/deeper/folder/"},
+                       {.name = "sub/deeper/a", .bytes = "new"}}),
+              -1);
+    EXPECT_TRUE(std::filesystem::is_empty(machine.HostName(R"(C:\victim)")));
+    EXPECT_EQ(Extract({{.name = "sub/"}, {.name = "sub/deeper/"}, {.name = "sub/deeper/a", .bytes = "new"}}), -1);
+    EXPECT_TRUE(std::filesystem::is_empty(machine.HostName(R"(C:\victim)")));
+    EXPECT_TRUE(log.Has(Error("ERROR: failed to write zip entry file sub/deeper/a"))) << log.Text();
+}
+
+TEST_F(ExtractionTest, FilesOfManyFoldersMayStandInAnyOrder) {
+    EXPECT_EQ(Extract({{.name = "a/"},
+                       {.name = "a/b/"},
+                       {.name = "ab/"},
+                       {.name = "a/b/1", .bytes = "1"},
+                       {.name = "ab/2", .bytes = "2"},
+                       {.name = "3", .bytes = "3"},
+                       {.name = "a/4", .bytes = "4"},
+                       {.name = "a/b/5", .bytes = "5"}}),
+              0)
+        << log.Text();
+    EXPECT_EQ(machine.Content(kOut + R"(\a\b\1)") + machine.Content(kOut + R"(\ab\2)") +
+                  machine.Content(kOut + R"(\3)") + machine.Content(kOut + R"(\a\4)") +
+                  machine.Content(kOut + R"(\a\b\5)"),
+              "12345");
 }
 
 TEST_F(ExtractionTest, TheFirstFailureEndsItAndWhatWasWrittenStays) {

@@ -1,10 +1,12 @@
-// Disks that run full while an archive is unpacked. Only the hosted machine can be broken, so these exist for it alone.
+// Disks that run full while an archive is unpacked, and links in place of a file. Only the hosted machine can be
+// broken, and Wine shows a host's link to a file as that file, so these exist for it alone.
 #include <gtest/gtest.h>
 
 #include "package/Package.h"
 #include "package/ZipEntries.h"
 #include "tests/support/ArchiveBuilder.h"
 #include "tests/support/Faults.h"
+#include "tests/support/HostLink.h"
 #include "tests/support/LogRecorder.h"
 #include "tests/support/Machine.h"
 
@@ -72,6 +74,21 @@ TEST_F(ExtractionOnAFullDisk, DoesNotMakeAPackageCountAsExtracted) {
     EXPECT_FALSE(package.ExtractTo(fs::path(kOut)));
     EXPECT_FALSE(package.IsExtracted());
     EXPECT_EQ(package.extractedPath, fs::path());
+}
+
+TEST(ExtractionOntoALink, WritesNothingThroughIt) {
+    Machine machine;
+    const LogRecorder log;
+    machine.Has(R"(C:\victim)", "somebody else's");
+    machine.HasFolder(kOut);
+    machine.Has(kPath, ArchiveBuilder().Add({.name = "a", .bytes = "new"}).Add({.name = "b", .bytes = "new"}).Bytes());
+    for (const char* target : {R"(C:\victim)", R"(C:\made)"}) {
+        const HostLink link(machine, kOut + R"(\a)", target);
+        EXPECT_EQ(HV::ExtractZip(kPath, kOut), -1);
+        EXPECT_TRUE(log.Has("ERROR hvdeploy-detail: ERROR: failed to write zip entry file a")) << log.Text();
+    }
+    EXPECT_EQ(machine.Content(R"(C:\victim)"), "somebody else's");
+    EXPECT_FALSE(machine.Exists(R"(C:\made)"));
 }
 
 }  // namespace
