@@ -13,6 +13,7 @@
 #include "hvframework/StringUtils.h"
 #include "platform/files.h"
 #include "platform/filesystem.h"
+#include "platform/held_folder.h"
 #include "platform/removal.h"
 
 namespace HVL::FileUtils {
@@ -234,16 +235,40 @@ int DeleteFileOrDirectory(const std::string& path) {
 
 namespace {
 
-// Copies what is in `source`; the directory `destination` is there. Each entry's path is formed from the iterator's own
-// by changing its front, and its kind is what the listing told: nothing is asked twice.
+using platform::HeldFolder;
+
+bool Refuse(const std::string& link) {
+    std::cerr << "ERROR: refusing to copy into the link at " << link << std::endl;
+    return false;
+}
+
+// Holds the directory `target`, which this program has just made if `made`, until it is filled. False when it is a
+// link: one that it has made is none, and any other link is followed as everywhere else. A directory that cannot be
+// held, as on a drive that somebody shares, is filled all the same.
+bool HoldWhileFilled(const std::string& target, bool made, std::vector<std::unique_ptr<HeldFolder>>& held) {
+    bool isLink = false;
+    std::string planted;
+    held.push_back(made ? platform::HoldOwnFolder(target, isLink) : platform::HoldFolder(target, planted));
+    return (!isLink && planted.empty()) || Refuse(isLink ? target : planted);
+}
+
+// Copies what is in `source`; the directory `destination` is there, and held. Each entry's path is formed from the
+// iterator's own by changing its front, and its kind is what the listing told: nothing is asked twice.
 int CopyTree(const std::string& source, const std::string& destination) {
     const std::size_t front = fs::path(StripTrailingSeparator(source)).native().size();
     const fs::path newFront(StripTrailingSeparator(destination));
-    for (const fs::directory_entry& entry : fs::recursive_directory_iterator(fs::path(source))) {
+    std::vector<std::unique_ptr<HeldFolder>> held;
+    for (fs::recursive_directory_iterator at{fs::path(source)}, end; at != end; ++at) {
+        const fs::directory_entry& entry = *at;
         const fs::path target(newFront.native() + entry.path().native().substr(front));
         const fs::file_status status = entry.symlink_status();
+        // Those of the folders that the walk has left are let go.
+        held.resize(static_cast<std::size_t>(at.depth()));
         if (fs::is_directory(status)) {
-            fs::create_directory(target);
+            const bool made = fs::create_directory(target);
+            if (!HoldWhileFilled(target.string(), made, held)) {
+                return -1;
+            }
         } else if (fs::is_symlink(status) && fs::is_directory(entry.status())) {
             // The walk does not enter it, so a copy would be an empty directory, and a move would lose what is there.
             return -1;
@@ -252,6 +277,16 @@ int CopyTree(const std::string& source, const std::string& destination) {
         }
     }
     return 0;
+}
+
+// The destination itself is held as what is in it is.
+int CopyDirectory(const std::string& source, const std::string& destination) {
+    const bool made = !DirectoryExists(destination);
+    if (made && platform::MakeDirectory(destination) != 0) {
+        return -1;
+    }
+    std::vector<std::unique_ptr<HeldFolder>> held;
+    return HoldWhileFilled(destination, made, held) ? CopyTree(source, destination) : -1;
 }
 
 }  // namespace
@@ -271,10 +306,7 @@ int CopyFileOrDirectory(const std::string& source, const std::string& destinatio
         fs::copy_file(fs::path(source), fs::path(destination));
         return 0;
     }
-    if (!DirectoryExists(destination) && platform::MakeDirectory(destination) != 0) {
-        return -1;
-    }
-    return CopyTree(source, destination);
+    return CopyDirectory(source, destination);
 }
 
 bool MoveFileOrDirectory(const std::string& source, const std::string& destination) {

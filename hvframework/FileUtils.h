@@ -87,7 +87,8 @@ int DeleteFileOrDirectory(const std::string& path);
 
 /// Copies a file or a directory tree to the path `destination`, making its parent first. Returns 0 on success; -1,
 /// some of them with a line on the standard error stream, when the parent or the destination directory cannot be made,
-/// the source does not exist, or the tree holds a link onto a directory. A file is never overwritten: throws
+/// the source does not exist, the tree holds a link onto a directory, or a directory that it has made has become a link
+/// since. Each is held while it is filled. A file is never overwritten: throws
 /// fs::filesystem_error when one is in the way, or when a single file cannot be copied. What was copied before a
 /// failure stays.
 [[nodiscard]] int CopyFileOrDirectory(const std::string& source, const std::string& destination);

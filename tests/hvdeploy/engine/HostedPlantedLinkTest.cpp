@@ -1,5 +1,9 @@
 // Links on the way to where payloads go. Only hosted they can be another account's, and only root can make them so.
+#include <sys/stat.h>
 #include <unistd.h>
+
+#include <cstdio>
+#include <filesystem>
 
 #include "tests/hvdeploy/engine/EngineTest.h"
 #include "tests/support/Faults.h"
@@ -85,6 +89,52 @@ TEST_F(StrangersLinkTest, InPlaceOfTheItemItselfIsMovedAside) {
     EXPECT_EQ(Install({Presets()}), 1);
     EXPECT_FALSE(machine.Exists(std::string(kVictim) + R"(\new)"));
     EXPECT_EQ(machine.Content(item), "new soft");
+}
+
+// The folders of a payload are made and filled one after the other. Here each is everybody's from its first moment on,
+// and becomes a link as soon as it is seen.
+TEST_F(StrangersLinkTest, InPlaceOfAFolderThatHasJustBeenMadeIsNotFilled) {
+    constexpr int kRounds = 10;
+    constexpr int kFolders = 30;
+    PackageBuilder bundle = PackageBuilder("com.halvorn.glow").Payload("presets").To("commondocs", "Halvorn");
+    bundle.Folder("bundle").Source("bundle");
+    for (int i = 0; i < kFolders; ++i) {
+        const std::string folder = "bundle/" + std::to_string(i);
+        bundle.File(folder + "/deeper/a", "new").File(folder + "/b", "new");
+    }
+    const fs::path package = bundle.WriteTo(kPackages);
+    namespace host = std::filesystem;
+    host::permissions(machine.HostName(R"(C:\)") + "/..", host::perms(0755));
+    machine.HasFolder(kVictim);
+    ASSERT_EQ(chmod(machine.HostName(kVictim).c_str(), 0777), 0);
+    machine.HasFolder(kShared);
+    Stranger::Owns(machine.HostName(kShared));
+    const std::string shared = machine.HostName(kShared);
+    const std::string victim = machine.HostName(kVictim);
+    const mode_t mask = umask(0);
+    for (int round = 0; round < kRounds; ++round) {
+        SCOPED_TRACE(round);
+        const Stranger stranger([&] {
+            std::error_code error;
+            for (host::recursive_directory_iterator at(shared, error), end; !error && at != end; at.increment(error)) {
+                if (host::is_directory(at->symlink_status(error)) && at->path().extension() != ".away") {
+                    const std::string folder = at->path();
+                    if (std::rename(folder.c_str(), (folder + ".away").c_str()) == 0) {
+                        (void)!symlink(victim.c_str(), folder.c_str());
+                    }
+                }
+            }
+        });
+        HV::Deploy other(nullptr);
+        (void)other.DeployPackage(package);
+        EXPECT_TRUE(host::is_empty(victim));
+    }
+    umask(mask);
+    bool moved = false;
+    for (const auto& entry : host::recursive_directory_iterator(shared)) {
+        moved |= entry.path().extension() == ".away";
+    }
+    EXPECT_TRUE(moved) << "the stranger came too late to have proved anything";
 }
 
 TEST_F(PlantedLinkTest, OfARightfulOwnerIsFollowed) {
