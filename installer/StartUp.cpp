@@ -2,10 +2,11 @@
 
 #include <log4cpp/Appender.hh>
 
+#include "hvdeploy/src/GuardedFolders.h"
 #include "hvdeploy/src/Logging.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/Log.h"
-#include "hvframework/StringUtils.h"
+#include "hvframework/TempFolder.h"
 #include "installer/WizardBoxes.h"
 #include "installer/WizardToolkit.h"
 
@@ -16,25 +17,39 @@ using namespace HVL;
 
 constexpr const char* kLogFileName = "Tessaly Suite Installer.log";
 
-std::string PropertyFileOfTheMachine() {
-    const std::string company = FileUtils::JoinPath(StringUtils::GetEnvironmentValue("ProgramData"), "Halvorn");
-    return FileUtils::JoinPath(FileUtils::JoinPath(company, "Installer"), "halvorn.logging.config");
-}
+/// A property file that this run has written for itself, in a folder where nobody else can put another one in its
+/// place while logging is configured from it. The file stays.
+class OwnPropertyFile {
+public:
+    // What fails here is reported by ConfigureLogging: a property file that is not there, or a log file that it cannot
+    // open.
+    OwnPropertyFile() : folder_("tmp") {
+        if (folder_.IsThere()) {
+            path_ = FileUtils::JoinPath(folder_.Path(), "hvinstaller.cfg");
+            (void)WriteLoggingConfig(path_, kLogFileName, "");
+        }
+    }
 
-// What fails here is reported by ConfigureLogging: a property file that is not there, or a log file that it cannot
-// open.
-std::string MakePropertyFile() {
-    const std::string folder = FileUtils::MakeTempPath("tmp", FileUtils::GetTempDirectory());
-    (void)FileUtils::CreateDirectories(folder);
-    const std::string file = folder + "\\hvinstaller.cfg";
-    (void)WriteLoggingConfig(file, kLogFileName, "");
-    return file;
+    [[nodiscard]] const std::string& Path() const { return path_; }
+
+private:
+    TempFolder folder_;
+    std::string path_;
+};
+
+// Fixed (contracts, log): configured twice. A property file that lets the test lines through gets each of them
+// twice, and what cannot be done is reported twice. The second round puts new appenders in the place of the
+// first's, which the library then forgets: a file that such a one held open could not be rolled over.
+void ConfigureTwice(const std::string& file) {
+    (void)ConfigureLogging(file);
+    log4cpp::Appender::closeAll();
+    (void)ConfigureLogging(file);
 }
 
 // A folder of that name is nobody's configuration.
-std::string ChoosePropertyFile() {
-    const std::string file = PropertyFileOfTheMachine();
-    return FileUtils::FileExists(file) ? file : MakePropertyFile();
+void ConfigureFromWhatIsThere() {
+    const std::string file = LoggingConfigOfTheMachine();
+    ConfigureTwice(FileUtils::FileExists(file) && !IsRefused(file) ? file : OwnPropertyFile().Path());
 }
 
 }  // namespace
@@ -44,15 +59,11 @@ std::string PackagesDirectoryPath(const std::string& programPath) {
 }
 
 void StartLogging() {
-    const std::string file = ChoosePropertyFile();
-    // Fixed (contracts, log): configured twice. A property file that lets the test lines through gets each of them
-    // twice, and what cannot be done is reported twice. The second round puts new appenders in the place of the
-    // first's, which the library then forgets: a file that such a one held open could not be rolled over.
-    (void)ConfigureLogging(file);
-    log4cpp::Appender::closeAll();
-    (void)ConfigureLogging(file);
+    const GuardedFolders guarded;
+    ConfigureFromWhatIsThere();
     Log::General().setPriority(log4cpp::Priority::DEBUG);
     Log::Detail().setPriority(log4cpp::Priority::DEBUG);
+    guarded.LogWarnings();
 }
 
 void RequirePackagesDirectory(WizardToolkit& toolkit, const std::string& packagesDirectory) {

@@ -1,5 +1,6 @@
 #include "hvdeploy/src/InstalledHistory.h"
 
+#include "hvdeploy/src/GuardedFolders.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
 #include "package/PackageNames.h"
@@ -19,13 +20,14 @@ std::string HistoryFolder() {
 
 std::vector<std::string> ReadHistoryStems(const std::string& folder) {
     std::vector<std::string> stems;
-    if (!HVL::FileUtils::DirectoryExists(folder)) {
+    if (IsRefused(folder) || !HVL::FileUtils::DirectoryExists(folder)) {
         return stems;
     }
     for (const fs::directory_entry& entry : fs::directory_iterator(fs::path(folder))) {
         const std::string name = entry.path().filename().string();
-        if (HVL::StringUtils::EndsWith(name, kManifestEnding) && fs::is_regular_file(entry.status())) {
-            stems.push_back(name.substr(0, name.size() - kManifestEnding.size()));
+        if (HVL::StringUtils::EndsWith(name, kRecordEnding) && fs::is_regular_file(entry.status()) &&
+            !IsRefused(HVL::FileUtils::JoinPath(folder, name))) {
+            stems.push_back(name.substr(0, name.size() - std::string(kRecordEnding).size()));
         }
     }
     return stems;

@@ -137,6 +137,11 @@ void WriteTestLines() {
 
 }  // namespace
 
+std::string LoggingConfigOfTheMachine() {
+    const std::string company = FileUtils::JoinPath(StringUtils::GetEnvironmentValue("ProgramData"), "Halvorn");
+    return FileUtils::JoinPath(FileUtils::JoinPath(company, "Installer"), "halvorn.logging.config");
+}
+
 int WriteLoggingConfig(const std::string& configPath, const std::string& logFileName, const std::string& logDir) {
     const std::string folder = logDir.empty() ? DefaultLogFolder() : logDir;
     // ConfigureLogging reports the file that cannot be opened where the folder cannot be made.

@@ -5,6 +5,9 @@
 /// How the log categories come to life: from a property file, or in code from the arguments of a line.
 namespace HV {
 
+/// The path of the property file that the wizard obeys if there is one.
+[[nodiscard]] std::string LoggingConfigOfTheMachine();
+
 /// Writes a property file to `configPath` that logs to the console and to `logFileName` in `logDir`, with files of up
 /// to 100 MiB and ten backups. An empty `logDir` means the default log folder; the folder is made if need be. Returns 1
 /// when `configPath` could be opened for writing, else 0.

@@ -2,8 +2,10 @@
 
 #include <algorithm>
 #include <iostream>
+#include <optional>
 
 #include "hvdeploy/src/ArgumentLine.h"
+#include "hvdeploy/src/GuardedFolders.h"
 #include "hvdeploy/src/HVDeployCLI.h"
 #include "hvdeploy/src/Interrupts.h"
 #include "hvdeploy/src/ProgressBar.h"
@@ -111,7 +113,9 @@ Ending RunArguments(const std::vector<std::string>& arguments, ProgressListenerI
         return {1, kNoRun};
     }
     const bool isList = cli.CountArg("list=");
+    std::optional<GuardedFolders> guarded;
     if (!isList) {
+        guarded.emplace().LogWarnings();
         reports.Open();
     }
     const int exitStatus = cli.Run() == 0 ? 0 : 1;

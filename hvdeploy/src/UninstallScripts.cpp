@@ -5,6 +5,7 @@
 #include <iostream>
 #include <utility>
 
+#include "hvdeploy/src/GuardedFolders.h"
 #include "hvdeploy/src/ScriptMaker.h"
 #include "hvframework/FileUtils.h"
 #include "hvframework/StringUtils.h"
@@ -20,7 +21,7 @@ namespace {
 
 using namespace HVL::FileUtils;
 
-constexpr const char* kScriptFolder = "C:\\ProgramData\\Halvorn\\uninstall";
+constexpr const char* kUninstallKey = "HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall\\";
 
 // The version is part of the name, so a new version gets an entry of its own, and the older one stays until its script
 // removes it.
@@ -90,6 +91,8 @@ std::string Today() {
 
 }  // namespace
 
+const char* const kUninstallScriptFolder = "C:\\ProgramData\\Halvorn\\uninstall";
+
 // Fixed (contracts, removal script): bare carriage returns between the lines, and no equals sign after the first
 // SCRIPT_NAME.
 std::string ScriptMaker::GetHeader() const {
@@ -103,7 +106,7 @@ std::string GetUninstallScriptPath(const Package& package, const HVL::ProductDat
     } else {
         tag = package.GetName() + "_v" + package.manifest.productVersion;
     }
-    return JoinPath(kScriptFolder, "uninstall-" + tag + ScriptMaker().GetScriptExtension());
+    return JoinPath(kUninstallScriptFolder, "uninstall-" + tag + ScriptMaker().GetScriptExtension());
 }
 
 bool UninstallScripts::WriteStandaloneUninstallScript(std::string& scriptPath,
@@ -178,7 +181,7 @@ bool UninstallScripts::WriteServiceUninstallScript(std::string& scriptPath, cons
 
 // Returns whether the script exists; its lines are in `knownLines` then.
 bool UninstallScripts::ReadExistingLines(const std::string& scriptPath) {
-    const bool exists = FileExists(scriptPath);
+    const bool exists = FileExists(scriptPath) && !IsRefused(scriptPath);
     if (exists && scriptPath == knownPath && SizeOf(scriptPath) == knownSize) {
         return true;
     }
@@ -194,6 +197,9 @@ bool UninstallScripts::ReadExistingLines(const std::string& scriptPath) {
 }
 
 void UninstallScripts::Append(const std::string& scriptPath, const std::string& text) {
+    if (IsRefused(scriptPath)) {
+        return;
+    }
     std::FILE* const file = platform::OpenStream(scriptPath, "a");
     if (file == nullptr) {
         return;
@@ -212,7 +218,7 @@ void UninstallScripts::Append(const std::string& scriptPath, const std::string& 
 }
 
 void OSRegisterUninstall(const std::string& scriptPath, const HVL::ProductData& product) {
-    if (!FileExists(scriptPath)) {
+    if (!FileExists(scriptPath) || IsRefused(scriptPath)) {
         return;
     }
     Win32RegKeyHandle entry;

@@ -12,12 +12,14 @@
 /// installed programs that runs it.
 namespace HV {
 
+/// The folder of the batch files. It is a fixed place and not looked up in the environment.
+extern const char* const kUninstallScriptFolder;
+
 /// The path of the batch file for `product`, or for the package alone when the product has no identifier or version.
-/// The folder is a fixed place and not looked up in the environment.
 std::string GetUninstallScriptPath(const Package& package, const HVL::ProductData& product);
 
 /// Enters `product` in the system's list of installed programs, with `scriptPath` as its command of removal. Does
-/// nothing when the script does not exist, or when the entry cannot be made.
+/// nothing when the script does not exist or IsRefused(), or when the entry cannot be made.
 void OSRegisterUninstall(const std::string& scriptPath, const HVL::ProductData& product);
 
 /// Writes batch files segment by segment, one for each package of a product.

@@ -5,9 +5,12 @@
 #include <log4cpp/Category.hh>
 #include <log4cpp/Priority.hh>
 
+#include <filesystem>
+
 #include "hvframework/Log.h"
 #include "installer/StartUp.h"
 #include "platform/filesystem.h"
+#include "platform/guarded_folder.h"
 #include "platform/win32.h"
 #include "tests/support/CapturedStreams.h"
 #include "tests/support/Machine.h"
@@ -247,6 +250,26 @@ TEST_F(StartLoggingTest, GoesOnWhereTheTemporaryFolderCannotBeMade) {
     EXPECT_EQ(CountOf("Logging configuration error: ", errors), 2U) << errors;
     EXPECT_FALSE(machine.Exists(kDefaultLog));
     ExpectEverythingIsLogged();
+}
+
+// A second name of a file is what everybody can make without being seen as its owner.
+TEST_F(StartLoggingTest, DoesNotObeyAPropertyFileThatMayBeAnybodys) {
+    if (!platform::CanGuardFolders()) {
+        GTEST_SKIP() << "only root guards folders";
+    }
+    machine.HasFolder(R"(C:\Own)");
+    machine.Has(R"(C:\Own\planted)", OwnProperties("INFO"));
+    machine.HasFolder(R"(C:\ProgramData\Halvorn\Installer)");
+    std::filesystem::create_hard_link(machine.HostName(R"(C:\Own\planted)"), machine.HostName(kPropertyFile));
+    Start();
+    EXPECT_FALSE(machine.Exists(R"(C:\Own\own.log)"));
+    EXPECT_FALSE(machine.Exists(kPropertyFile));
+    const std::string text = machine.Content(kDefaultLog);
+    EXPECT_EQ(CountOf(std::string(" [WARN] hvdeploy-detail: somebody else than an administrator may have made ") +
+                          kPropertyFile + "; it is not used, and now it is C:\\ProgramData\\Halvorn\\set-aside-",
+                      text),
+              1U)
+        << text;
 }
 
 // Without the variable the places are below the root of the current drive, as their names then say.
