@@ -14,7 +14,6 @@
 #include "installer/InstallerModel.h"
 #include "package/Package.h"
 #include "package/PackageNames.h"
-#include "package/ValidationTable.h"
 #include "platform/filesystem.h"
 
 namespace HV {

@@ -5,6 +5,7 @@
 #include <stdexcept>
 #include <string_view>
 
+#include "hvframework/StringUtils.h"
 #include "platform/running_processes.h"
 
 namespace HV {
@@ -16,10 +17,6 @@ constexpr std::size_t kMostProcesses = 1024;
 std::string FileNameOf(const std::string& path) {
     const std::size_t separator = path.rfind('\\');
     return separator == std::string::npos ? std::string() : path.substr(separator + 1);
-}
-
-char Lower(char c) {
-    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
 }
 
 }  // namespace

@@ -5,7 +5,7 @@
 #include <iostream>
 #include <utility>
 
-#include "hvframework/XmlNesting.h"
+#include "hvframework/XmlText.h"
 #include "platform/program.h"
 
 namespace HV {

@@ -40,7 +40,7 @@ GuardedFolders::GuardedFolders() {
     if (!platform::CanGuardFolders()) {
         return;
     }
-    const std::string history = kHistoryFolder;
+    const std::string history = HistoryFolder();
     GuardCompanyFolder(GetParentPath(kUninstallScriptFolder), {{kUninstallScriptFolder, Content::EveryFile},
                                                                {GetParentPath(history), Content::Nothing},
                                                                {history, Content::EveryFile}});

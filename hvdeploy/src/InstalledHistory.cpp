@@ -25,9 +25,9 @@ std::vector<std::string> ReadHistoryStems(const std::string& folder) {
     }
     for (const fs::directory_entry& entry : fs::directory_iterator(fs::path(folder))) {
         const std::string name = entry.path().filename().string();
-        if (HVL::StringUtils::EndsWith(name, kRecordEnding) && fs::is_regular_file(entry.status()) &&
+        if (HVL::StringUtils::EndsWith(name, kManifestEnding) && fs::is_regular_file(entry.status()) &&
             !IsRefused(HVL::FileUtils::JoinPath(folder, name))) {
-            stems.push_back(name.substr(0, name.size() - std::string(kRecordEnding).size()));
+            stems.push_back(name.substr(0, name.size() - kManifestEnding.size()));
         }
     }
     return stems;

@@ -35,8 +35,8 @@ private:
 /// The folder that records what is installed. It is a fixed place and not looked up in the environment.
 [[nodiscard]] std::string HistoryFolder();
 
-/// The stems of `folder`: one for each regular file whose name ends in "_hvmanifest.xml", without those that
-/// IsRefused().
+/// The stems of `folder`, in its order: one for each regular file whose name ends in "_hvmanifest.xml", without that
+/// ending. Files that IsRefused() are left out.
 std::vector<std::string> ReadHistoryStems(const std::string& folder);
 
 /// The text of a stem before the first "_v", or all of it.

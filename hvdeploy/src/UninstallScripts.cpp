@@ -21,8 +21,6 @@ namespace {
 
 using namespace HVL::FileUtils;
 
-constexpr const char* kUninstallKey = "HKEY_LOCAL_MACHINE\\SOFTWARE\\Microsoft\\Windows\\CurrentVersion\\Uninstall\\";
-
 // The version is part of the name, so a new version gets an entry of its own, and the older one stays until its script
 // removes it.
 std::string EntryName(const HVL::ProductData& product) {

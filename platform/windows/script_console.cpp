@@ -110,20 +110,20 @@ void OpenMissingStandardStreams() {
 
 WindowlessConsole::WindowlessConsole() {
     if (!HasConsole()) {
-        StartHolder();
+        StartOwner();
     }
 }
 
 WindowlessConsole::~WindowlessConsole() {
-    LetHolderEnd();
+    ReleaseOwner();
 }
 
-void WindowlessConsole::LetHolderEnd() {
+void WindowlessConsole::ReleaseOwner() {
     Close(input_);
-    Close(holder_);
+    Close(owner_);
 }
 
-void WindowlessConsole::StartHolder() {
+void WindowlessConsole::StartOwner() {
     SECURITY_ATTRIBUTES inherited{sizeof inherited, nullptr, TRUE};
     HANDLE itsInput = nullptr;
     if (::CreatePipe(&itsInput, &input_, &inherited, 0) == FALSE) {
@@ -132,15 +132,15 @@ void WindowlessConsole::StartHolder() {
     ::SetHandleInformation(input_, HANDLE_FLAG_INHERIT, 0);
     HANDLE nowhere = NullDevice(inherited);
     const PROCESS_INFORMATION made = StartCommandProcessor(itsInput, nowhere);
-    holder_ = made.hProcess;
-    holderId_ = made.dwProcessId;
+    owner_ = made.hProcess;
+    ownerId_ = made.dwProcessId;
     Close(itsInput);
     Close(nowhere);
 }
 
 bool WindowlessConsole::Join() {
-    const bool joined = HasConsole() || JoinHolder();
-    LetHolderEnd();
+    const bool joined = HasConsole() || JoinOwner();
+    ReleaseOwner();
     if (joined) {
         return true;
     }
@@ -151,9 +151,9 @@ bool WindowlessConsole::Join() {
     return true;
 }
 
-bool WindowlessConsole::JoinHolder() const {
-    for (int tried = 0; holder_ != nullptr && tried < kTries; ++tried) {
-        if (::AttachConsole(holderId_) != FALSE) {
+bool WindowlessConsole::JoinOwner() const {
+    for (int tried = 0; owner_ != nullptr && tried < kTries; ++tried) {
+        if (::AttachConsole(ownerId_) != FALSE) {
             return true;
         }
         // A program may have been given a console that leads nowhere; it lets go of that first.
@@ -161,7 +161,7 @@ bool WindowlessConsole::JoinHolder() const {
             ::FreeConsole();
         }
         // Not yet: the command processor has to come to life first. If it ends, it never will.
-        if (::WaitForSingleObject(holder_, kBetweenTries) == WAIT_OBJECT_0) {
+        if (::WaitForSingleObject(owner_, kBetweenTries) == WAIT_OBJECT_0) {
             return false;
         }
     }

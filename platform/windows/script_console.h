@@ -34,12 +34,12 @@ public:
     bool Join();
 
 private:
-    void StartHolder();
-    [[nodiscard]] bool JoinHolder() const;
-    void LetHolderEnd();
+    void StartOwner();
+    [[nodiscard]] bool JoinOwner() const;
+    void ReleaseOwner();
 
-    HANDLE holder_ = nullptr;  // the command processor, which has the console
-    DWORD holderId_ = 0;
+    HANDLE owner_ = nullptr;  // the command processor, whose console this is
+    DWORD ownerId_ = 0;
     HANDLE input_ = nullptr;  // it waits for what is written here
 };
 

@@ -7,9 +7,9 @@
 #include <filesystem>
 
 #include "hvframework/Log.h"
-#include "installer/SharedDirectory.h"
 #include "installer/StartUp.h"
 #include "platform/guarded_folder.h"
+#include "platform/shared_directory.h"
 #include "tests/support/CapturedStreams.h"
 #include "tests/support/Machine.h"
 
@@ -45,7 +45,7 @@ TEST_F(HostedStartLoggingTest, LeavesTheLogFoldersOpenAndNothingElse) {
     // Open to everybody, as somebody may have left them.
     for (const char* folder :
          {"", R"(\uninstall)", R"(\.hvdeploy)", R"(\.hvdeploy\history)", R"(\Installer)", R"(\logs)"}) {
-        HV::CreateSharedDirectory(kCompany + folder);
+        platform::CreateSharedDirectory(kCompany + folder);
         ASSERT_EQ(OthersRights(kCompany + folder), host::perms::others_all) << folder;
     }
     Start();

@@ -32,7 +32,7 @@ private:
     mode_t before_;
 };
 
-TEST(HostedSharedDirectory, IsOpenToEverybodyWhicheverUserMakesIt) {
+TEST(HostedSharedDirectory, IsOpenToEverybodyWhoeverMakesIt) {
     Machine machine;
     const PrivateMaker maker;
     platform::CreateSharedDirectory(kFolder);

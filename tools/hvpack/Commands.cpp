@@ -86,7 +86,11 @@ bool IsSuiteFile(const fs::path& file) {
 }
 
 bool CheckOne(const std::string& file, std::ostream& out, std::ostream& err) {
-    Warn(ValidatedPackage(file).manifest, file, err);
+    if (IsSuiteFile(fs::path(file))) {
+        RefuseUnlessSuite(file);
+    } else {
+        Warn(ValidatedPackage(file).manifest, file, err);
+    }
     out << "OK " << file << '\n';
     return true;
 }

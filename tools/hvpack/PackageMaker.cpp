@@ -13,6 +13,7 @@
 #include "package/ZipEntries.h"
 #include "platform/libraries.h"
 #include "tools/hvpack/PackageError.h"
+#include "tools/hvpack/ReleaseNames.h"
 #include "tools/hvpack/ValidatedPackage.h"
 #include "tools/hvpack/Zip64Count.h"
 
