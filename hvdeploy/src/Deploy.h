@@ -108,6 +108,9 @@ public:
     HostAppCheck& HostCheck() { return hostCheck; }
     DeployRollback& Rollback() { return rollback; }
 
+    /// Whether the system has refused to copy something, which is no failure of the run.
+    bool HasLeftOut() const { return leftOut; }
+
     /// The rows of the build validation table by file name. The engine installs what is not among them as well.
     const std::map<std::string, ValidationInfo>& KnownPackages() const { return validationInfo; }
 
@@ -143,6 +146,7 @@ private:
     bool verbose = false;
     bool legacyUninstall = false;
     bool cancelled = false;
+    bool leftOut = false;
     bool serviceUninstall = false;  // nothing sets it: the standalone script is the one that is written
     boost::mutex cancelMutex;       // guards `cancelled`; never held across a call
     bool fatalErrorTest = false;

@@ -99,6 +99,7 @@ Placed Deploy::DeployPackagePayloads(const Package& package, float progressPoint
         }
         const Placed placed = DeployPayload(payload, package);
         all.files.insert(all.files.end(), placed.files.begin(), placed.files.end());
+        leftOut |= placed.leftOut;
         points.SpendShare(message);
         if (placed.result != kNothingDone) {
             all.result = placed.result;

@@ -157,6 +157,7 @@ Placed Placement::DeployHostPayload(const Payload& payload, const Package& packa
             }
             const Placed here = DeployPayloadToDirectory(payload, package, fs::path(target));
             all.result = here.result;
+            all.leftOut |= here.leftOut;
             if (here.result != kPlaced) {
                 break;
             }
@@ -180,8 +181,10 @@ Placed Placement::DeployPayloadToDirectory(const Payload& payload, const Package
         CopyItems(payload, package, destDir, placed);
     } catch (const std::exception& error) {
         HVL_LOG(Error, "exception deploying payload " << payload.id << ": " << error.what());
+        placed.leftOut = true;
     } catch (...) {
         HVL_LOG(Error, "unknown exception deploying payload " << payload.id);
+        placed.leftOut = true;
     }
     return placed;
 }

@@ -16,6 +16,7 @@ namespace HV {
 struct Placed {
     EngineResult result = kNothingDone;
     std::vector<std::string> files;
+    bool leftOut = false;  // the system refused to copy something, which the result does not say
 };
 
 /// Puts the files of payloads into the folders where they belong: those of hosts, of the system, or of applications.

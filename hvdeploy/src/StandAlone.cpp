@@ -92,11 +92,14 @@ const char* FailedOutcome(const DeployRollback& rollback) {
                                         : "failed; nothing was installed";
 }
 
-const char* Outcome(bool failed, const DeployRollback& rollback) {
+const char* Outcome(bool failed, Deploy& engine) {
     if (failed) {
-        return FailedOutcome(rollback);
+        return FailedOutcome(engine.Rollback());
     }
-    return rollback.HasInstalledFiles() ? "installed" : "nothing to do";
+    if (engine.Rollback().HasInstalledFiles()) {
+        return engine.HasLeftOut() ? "installed, but not all; the log says what is missing" : "installed";
+    }
+    return engine.HasLeftOut() ? "nothing was installed; the log says why" : "nothing to do";
 }
 
 /// What the user is told in the end, besides the exit status. A list speaks for itself.
@@ -120,7 +123,7 @@ Ending RunArguments(const std::vector<std::string>& arguments, ProgressListenerI
     }
     const int exitStatus = cli.Run() == 0 ? 0 : 1;
     const bool failed = exitStatus != 0 || cli.WasBrokenOff();
-    return {exitStatus, isList && !failed ? nullptr : Outcome(failed, cli.Engine().Rollback())};
+    return {exitStatus, isList && !failed ? nullptr : Outcome(failed, cli.Engine())};
 }
 
 /// The bar is gone from the terminal when this comes back.

@@ -183,6 +183,20 @@ TEST_F(OutcomeTest, IsThatThereWasNothingToDo) {
     EXPECT_EQ(Deploy().errors, "hvdeploy: nothing to do\n");
 }
 
+// A name that ends in dots cannot be copied on any target.
+TEST_F(OutcomeTest, IsThatNothingWasInstalledWhereTheSystemRefusedIt) {
+    Ships(PackageBuilder("com.halvorn.dots").Payload("resource").File("x", "x").To("programdata", "Halvorn\\dots..."));
+    const ProgramResult result = Deploy();
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.errors, "hvdeploy: nothing was installed; the log says why\n");
+}
+
+TEST_F(OutcomeTest, IsThatSomethingIsMissingWhereTheSystemRefusedIt) {
+    Ships(Glow());
+    Ships(Product("dots").Payload("resource").File("x", "x").To("programdata", "Halvorn\\dots..."));
+    EXPECT_EQ(Deploy().errors, "hvdeploy: installed, but not all; the log says what is missing\n");
+}
+
 TEST_F(OutcomeTest, IsThatTheRunFailedAndIsUndone) {
     Ships(Glow().Named("preflight-glow.hvpkg"));
     Ships(Failing());
