@@ -93,9 +93,8 @@ std::string ToUpper(std::string text) {
 std::string GetEnvironmentValue(const std::string& name) {
     std::array<char, kEnvironmentBufferSize> buffer;
     const auto length = GetEnvironmentVariableA(name.c_str(), buffer.data(), static_cast<DWORD>(buffer.size()));
-    // A value that does not fit is answered with the size it needs, and leaves the buffer undefined. One that fits ends
-    // at its zero: under Wine the length counts the letters of UTF-16, and not the bytes.
-    return length > 0 && length < buffer.size() ? std::string(buffer.data()) : std::string();
+    // A value that does not fit is answered with the size it needs, and leaves the buffer undefined.
+    return length < buffer.size() ? std::string(buffer.data(), length) : std::string();
 }
 
 }  // namespace HVL::StringUtils
