@@ -83,7 +83,7 @@ bool GuardedFolders::TakeCompanyFolder(const std::string& company) {
             case Guarding::Linked:
                 return true;
             case Guarding::Failed:
-                WarnOfFolder(company);
+                RefuseFolder(company);
                 return false;
             case Guarding::Missing:
                 if (!MakeCompanyFolder(company)) {
@@ -97,7 +97,7 @@ bool GuardedFolders::TakeCompanyFolder(const std::string& company) {
                 break;
         }
     }
-    WarnOfFolder(company);
+    RefuseFolder(company);
     return false;
 }
 
@@ -112,7 +112,7 @@ bool GuardedFolders::MakeCompanyFolder(const std::string& company) {
         return true;
     }
     if (reason == platform::NoFolder::Failed) {
-        WarnOfFolder(company);
+        RefuseFolder(company);
     }
     return reason == platform::NoFolder::Taken;
 }
@@ -134,7 +134,7 @@ void GuardedFolders::GuardPlace(const Place& place) {
             (void)MoveAway(place.path, NextPlaceAside() + GetFileName(place.path));
             break;
         case Guarding::Failed:
-            WarnOfFolder(place.path);
+            RefuseFolder(place.path);
             break;
     }
 }
@@ -192,8 +192,10 @@ void GuardedFolders::MakeFolderAside() {
     held_.push_back(platform::MakeGuardedFolder(aside_, reason));
 }
 
-void GuardedFolders::WarnOfFolder(const std::string& path) {
-    warnings_.push_back("the folder " + path + " cannot be taken over; what is in it is used as it is");
+// Whoever keeps a folder open for nobody else would otherwise choose what is read there.
+void GuardedFolders::RefuseFolder(const std::string& path) {
+    Refused().push_back(KeyOf(path));
+    warnings_.push_back("the folder " + path + " cannot be taken over; what is in it is not used");
 }
 
 bool IsRefused(const std::string& path) {

@@ -18,7 +18,7 @@ public:
     /// Takes over the company's folder and, where they are there, those in it that are read from. The company's folder
     /// is made where it is missing, so that nobody else makes it while the run goes on. A link in the place of a
     /// folder, and a file that IsPlanted(), goes into a new folder "set-aside-" and a random name; one that cannot be
-    /// moved IsRefused() until the next object of this class.
+    /// moved, and a folder that cannot be taken over, IsRefused() until the next object of this class.
     GuardedFolders();
 
     /// Removes what it has made if nothing has been put into it.
@@ -46,7 +46,7 @@ private:
     bool MoveAway(const std::string& path, const std::string& target);
     [[nodiscard]] std::string NextPlaceAside();
     void MakeFolderAside();
-    void WarnOfFolder(const std::string& path);
+    void RefuseFolder(const std::string& path);
 
     std::vector<std::string> warnings_;
     std::vector<std::string> made_;
@@ -56,8 +56,8 @@ private:
     int moved_ = 0;
 };
 
-/// Whether the item, or a folder above it, was found planted and could not be moved away: it must not be used. For the
-/// thread that has made the GuardedFolders, and for those that it starts afterwards.
+/// Whether the item, or a folder above it, could not be secured: found planted and not moved away, or not taken over.
+/// It must not be used. For the thread that has made the GuardedFolders, and for those that it starts afterwards.
 [[nodiscard]] bool IsRefused(const std::string& path);
 
 }  // namespace HV

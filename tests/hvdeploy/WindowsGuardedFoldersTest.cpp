@@ -3,7 +3,10 @@
 // HostedGuardedFoldersTest.cpp tests.
 #include <gtest/gtest.h>
 
+#include "hvdeploy/src/GuardedFolders.h"
+#include "hvdeploy/src/Logging.h"
 #include "platform/guarded_folder.h"
+#include "platform/win32.h"
 #include "tests/support/HostLink.h"
 #include "tests/support/Machine.h"
 
@@ -27,4 +30,22 @@ TEST(WindowsGuardedFolder, IsTakenOverOrToldToBeMissing) {
     machine.HasFolder(R"(C:\Elsewhere)");
     EXPECT_NE(platform::GuardFolder(R"(C:\Elsewhere)", outcome), nullptr);
     EXPECT_EQ(outcome, platform::Guarding::Done);
+}
+
+TEST(WindowsGuardedFolder, IsNotUsedWhileSomebodyKeepsItToHimself) {
+    Machine machine;
+    const std::string properties = HV::LoggingConfigOfTheMachine();
+    machine.Has(properties, "planted");
+    machine.HasFolder(R"(C:\ProgramData\Halvorn\uninstall)");
+    const HANDLE kept = CreateFileA(R"(C:\ProgramData\Halvorn\Installer)", FILE_LIST_DIRECTORY, 0, nullptr,
+                                    OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr);
+    ASSERT_NE(kept, INVALID_HANDLE_VALUE);
+    {
+        const HV::GuardedFolders guarded;
+        EXPECT_TRUE(HV::IsRefused(properties));
+        EXPECT_FALSE(HV::IsRefused(R"(C:\ProgramData\Halvorn\uninstall\uninstall-x.bat)"));
+    }
+    CloseHandle(kept);
+    const HV::GuardedFolders guarded;
+    EXPECT_FALSE(HV::IsRefused(properties));
 }

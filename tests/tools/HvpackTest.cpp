@@ -7,12 +7,12 @@
 #include "tests/support/LogRecorder.h"
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
-#include "tools/hvpack/Commands.h"
+#include "tests/tools/HvpackRun.h"
 
 namespace {
 
 /// A machine with the folder of a package on it.
-class HvpackTest : public testing::Test {
+class HvpackTest : public HvpackRun {
 protected:
     void SetUp() override {
         PackageBuilder description("com.halvorn.glow");
@@ -24,15 +24,6 @@ protected:
         machine.HasFolder(R"(C:\glow\an empty folder)");
     }
 
-    int Run(const std::vector<std::string>& arguments) {
-        std::ostringstream outStream;
-        std::ostringstream errStream;
-        const int status = HVPack::RunCommand(arguments, outStream, errStream);
-        out = outStream.str();
-        err = errStream.str();
-        return status;
-    }
-
     int Make(const std::string& output = R"(C:\out\glow.hvpkg)") {
         machine.HasFolder(R"(C:\out)");
         return Run({"make", R"(C:\glow)", output});
@@ -41,8 +32,6 @@ protected:
     bool ErrorHas(const std::string& text) const { return err.find(text) != std::string::npos; }
 
     Machine machine;
-    std::string out;
-    std::string err;
 };
 
 const char* const kUsageStart = "usage: hvpack make FOLDER OUT.hvpkg";

@@ -6,7 +6,7 @@
 
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
-#include "tools/hvpack/Commands.h"
+#include "tests/tools/HvpackRun.h"
 
 namespace {
 
@@ -15,18 +15,9 @@ constexpr const char* kSuite = R"(C:\packages\suite.json)";
 const std::string kBadInNames = R"(\/%&|<>^!":*?)";
 const std::string kBadInSuiteNames = R"(\/%&|<>^!")";
 
-class ReleaseNamesTest : public testing::Test {
+class ReleaseNamesTest : public HvpackRun {
 protected:
     ReleaseNamesTest() { machine.HasFolder(kFolder); }
-
-    int Run(const std::vector<std::string>& arguments) {
-        std::ostringstream outStream;
-        std::ostringstream errStream;
-        const int status = HVPack::RunCommand(arguments, outStream, errStream);
-        out = outStream.str();
-        err = errStream.str();
-        return status;
-    }
 
     /// Whether all three commands that look at packages refuse this one, with one line, and leave nothing behind.
     void ExpectRefused(const PackageBuilder& package, const std::string& name, const std::string& line) {
@@ -70,8 +61,6 @@ protected:
     }
 
     Machine machine;
-    std::string out;
-    std::string err;
 };
 
 std::string NamesFiles(const std::string& field, const std::string& value, char c) {

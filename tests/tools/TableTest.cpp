@@ -8,7 +8,7 @@
 #include "package/HeldFile.h"
 #include "tests/support/Machine.h"
 #include "tests/support/PackageBuilder.h"
-#include "tools/hvpack/Commands.h"
+#include "tests/tools/HvpackRun.h"
 #include "tools/hvpack/ReleaseTable.h"
 
 // What hvpack table says of a release with odd texts, compiled: the rows of this program. A test below makes the
@@ -37,7 +37,7 @@ PackageBuilder Product(const std::string& name) {
 }
 
 /// A machine with a folder of packages, and a folder for the table.
-class TableTest : public testing::Test {
+class TableTest : public HvpackRun {
 protected:
     TableTest() {
         machine.HasFolder(kFolder);
@@ -47,12 +47,7 @@ protected:
     int Table(const std::vector<std::string>& more = {}) {
         std::vector<std::string> arguments{"table", kFolder};
         arguments.insert(arguments.end(), more.begin(), more.end());
-        std::ostringstream outStream;
-        std::ostringstream errStream;
-        const int status = HVPack::RunCommand(arguments, outStream, errStream);
-        out = outStream.str();
-        err = errStream.str();
-        return status;
+        return Run(arguments);
     }
     static fs::path Ships(const PackageBuilder& package) { return package.WriteTo(kFolder); }
     /// The rows as they stand, without what is around them.
@@ -65,8 +60,6 @@ protected:
     }
 
     Machine machine;
-    std::string out;
-    std::string err;
 };
 
 TEST_F(TableTest, HasARowForEachPackageSortedByFileName) {
